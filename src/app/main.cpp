@@ -1,0 +1,13 @@
+#include "app/main_window.h"
+
+#include <QApplication>
+
+int main(int argc, char** argv) {
+    // Probing for a JACK server must never start one.
+    qputenv("JACK_NO_START_SERVER", "1");
+    QApplication app(argc, argv);
+    QApplication::setApplicationName(QStringLiteral("Orvelle Quindara"));
+    MainWindow window;
+    window.show();
+    return QApplication::exec();
+}

@@ -1,0 +1,9 @@
+#pragma once
+
+#include <QByteArray>
+#include <QString>
+
+// Text in setup and list files is the locale's 8-bit encoding, UTF-8 here. Files made on Windows
+// hold Windows-1252 instead; any bytes that are not valid UTF-8 are read that way, so they open.
+QByteArray EncodeAnsiText(const QString& text);
+QString DecodeAnsiText(const QByteArray& bytes);
