@@ -54,7 +54,8 @@ void SetDefaultMidiNote(Context& context, int index, const GmNames& names) {
 void GetStartupDefaults(Context& context, const SettingsStore& settings) {
     const QString section = QStringLiteral("Defaults");
     auto number = [&](const char* key, int fallback) {
-        return LenientNumber(settings.value(section, QString::fromLatin1(key), NumberText(fallback)));
+        return LenientNumber(
+            settings.value(section, QString::fromLatin1(key), NumberText(fallback)));
     };
     context.DefaultMidiChannel = number("MidiChannel", 0);
     context.DefaultMidiBank = number("MidiBank", 0);
@@ -63,5 +64,6 @@ void GetStartupDefaults(Context& context, const SettingsStore& settings) {
     context.MidiMainVolume = number("MidiMainVolume", 100);
     context.DefaultMetronomeNote = number("DefaultMetronomeNote", 37);
     context.MetronomeVelocity = number("DefaultMetronomeVelocity", 120);
-    context.MetronomeSound = settings.value(section, QStringLiteral("MetronomeSound"), BooleanText(true));
+    context.MetronomeSound =
+        settings.value(section, QStringLiteral("MetronomeSound"), BooleanText(true));
 }

@@ -13,8 +13,12 @@ inline constexpr int kFirstPad = 57;
 inline constexpr int kLastPad = 72;
 inline constexpr int kPadCount = kLastPad - kFirstPad + 1;
 inline constexpr int kSlotCount = 128;
-inline constexpr bool IsPad(int note) { return note >= kFirstPad && note <= kLastPad; }
-inline constexpr bool IsSlot(int note) { return note >= 0 && note < kSlotCount; }
+inline constexpr bool IsPad(int note) {
+    return note >= kFirstPad && note <= kLastPad;
+}
+inline constexpr bool IsSlot(int note) {
+    return note >= 0 && note < kSlotCount;
+}
 
 // What one MIDI note does. Every field is text, numbers in decimal and Booleans as
 // "True"/"False", because that is how setup files store them.
@@ -82,7 +86,8 @@ struct Context {
 // Resets all 128 slots to the defaults, then releases whatever wave each pad's channel holds.
 void InitializeAllMidiNotes(Context& context, const GmNames& names, WaveChannels& channels);
 
-// Resets one slot; its WaveVolume, WavePlaying and Reserved2 and the pad's channel stay as they are.
+// Resets one slot; its WaveVolume, WavePlaying and Reserved2 and the pad's channel stay as they
+// are.
 void SetDefaultMidiNote(Context& context, int slot, const GmNames& names);
 
 // Reads the "Defaults" section of the settings into the default values.

@@ -4,7 +4,9 @@
 
 namespace {
 
-bool IsBlank(QChar c) { return c == u' ' || c == u'\t'; }
+bool IsBlank(QChar c) {
+    return c == u' ' || c == u'\t';
+}
 
 // Reads sign and digits from position i; returns the number of digits read.
 int ReadSignedDigits(QStringView text, qsizetype& i, long long& value) {
@@ -16,7 +18,8 @@ int ReadSignedDigits(QStringView text, qsizetype& i, long long& value) {
     int digits = 0;
     long long magnitude = 0;
     while (i < text.size() && text[i] >= u'0' && text[i] <= u'9') {
-        if (magnitude <= static_cast<long long>(INT_MAX) + 1) magnitude = magnitude * 10 + (text[i].unicode() - u'0');
+        if (magnitude <= static_cast<long long>(INT_MAX) + 1)
+            magnitude = magnitude * 10 + (text[i].unicode() - u'0');
         ++i;
         ++digits;
     }

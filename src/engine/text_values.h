@@ -20,5 +20,9 @@ std::optional<int> StrictWholeNumber(QStringView text);
 // "True" or "False" (any letter case, surrounding blanks allowed); anything else is an error.
 std::optional<bool> StrictBoolean(QStringView text);
 
-inline QString BooleanText(bool value) { return value ? QStringLiteral("True") : QStringLiteral("False"); }
-inline QString NumberText(int value) { return QString::number(value); }
+inline QString BooleanText(bool value) {
+    return value ? QStringLiteral("True") : QStringLiteral("False");
+}
+inline QString NumberText(int value) {
+    return QString::number(value);
+}

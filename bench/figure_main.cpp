@@ -1,0 +1,65 @@
+// The main() of every benchmark program: runs the benchmarks as usual, then prints one figure per
+// benchmark as "NAME VALUE UNIT". A benchmark named "dispatch_ns" reports nanoseconds, one
+// named "..._us" microseconds; any other reports in its own time unit.
+#include <benchmark/benchmark.h>
+
+#include <QCoreApplication>
+
+#include <cmath>
+#include <cstdio>
+#include <string>
+#include <vector>
+
+namespace {
+
+struct Figure {
+    std::string name;
+    double value;
+    std::string unit;
+};
+
+class FigureReporter : public benchmark::ConsoleReporter {
+  public:
+    void ReportRuns(const std::vector<Run>& runs) override {
+        ConsoleReporter::ReportRuns(runs);
+        for (const Run& run : runs) {
+            if (run.error_occurred || run.run_type != Run::RT_Iteration) continue;
+            const std::string name = run.benchmark_name();
+            std::string unit = benchmark::GetTimeUnitString(run.time_unit);
+            double value = run.GetAdjustedRealTime();
+            if (name.size() > 3 && name.compare(name.size() - 3, 3, "_ns") == 0) {
+                value *= benchmark::GetTimeUnitMultiplier(benchmark::kNanosecond) /
+                         benchmark::GetTimeUnitMultiplier(run.time_unit);
+                unit = "ns";
+            } else if (name.size() > 3 && name.compare(name.size() - 3, 3, "_us") == 0) {
+                value *= benchmark::GetTimeUnitMultiplier(benchmark::kMicrosecond) /
+                         benchmark::GetTimeUnitMultiplier(run.time_unit);
+                unit = "us";
+            }
+            figures_.push_back({name, value, unit});
+        }
+    }
+    void Finalize() override {
+        ConsoleReporter::Finalize();
+        for (const Figure& figure : figures_) {
+            const double rounded = figure.value >= 100 ? std::round(figure.value)
+                                                       : std::round(figure.value * 100) / 100;
+            std::printf("%s %g %s\n", figure.name.c_str(), rounded, figure.unit.c_str());
+        }
+        std::fflush(stdout);
+    }
+
+  private:
+    std::vector<Figure> figures_;
+};
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    QCoreApplication app(argc, argv);
+    benchmark::Initialize(&argc, argv);
+    FigureReporter reporter;
+    benchmark::RunSpecifiedBenchmarks(&reporter);
+    benchmark::Shutdown();
+    return 0;
+}

@@ -1,0 +1,70 @@
+#include "engine/wave_playback.h"
+
+#include "components/audio/wave_channel.h"
+#include "components/prompts/prompts.h"
+#include "engine/note_slots.h"
+#include "engine/text_values.h"
+
+WavePlayback::WavePlayback(Context& context, WaveChannels& channels, Prompts& prompts,
+                           QObject* parent)
+    : QObject(parent), context_(context), channels_(channels), prompts_(prompts) {
+    connect(&channels_, &WaveChannels::playbackEnded, this, &WavePlayback::OnPlaybackEnded);
+}
+
+void WavePlayback::PlayWave(int note) {
+    if (!IsPad(note)) return;
+    NoteSlot& slot = context_.NoteSlots[note];
+    if (slot.WaveAssigned == QLatin1String("False")) return;
+
+    WaveChannel& channel = channels_.channel(note);
+    if (channel.isPlaying()) {
+        channel.stop();
+        slot.WavePlaying = BooleanText(false);
+        return;
+    }
+    if (!StartChannel(note)) {
+        // Nothing sounds, so the pad must not look as if it did: a once-only pad would otherwise
+        // never try again, even after its file is back.
+        slot.WavePlaying = BooleanText(false);
+        prompts_.message(
+            Notice(QStringLiteral("Problem playing specified audio file"), PromptIcon::Critical));
+    }
+}
+
+// Hands the slot's settings to the channel in their fixed order and starts it; false as soon as a
+// step fails. Settings made before the failing step stay made.
+bool WavePlayback::StartChannel(int note) {
+    NoteSlot& slot = context_.NoteSlots[note];
+    WaveChannel& channel = channels_.channel(note);
+    if (!channel.setFileName(slot.WaveFileName)) return false;
+    const std::optional<int> frequency = StrictWholeNumber(slot.WaveFrequency);
+    if (!frequency) return false;
+    channel.setFrequency(*frequency);
+    const std::optional<bool> looped = StrictBoolean(slot.WaveLooped);
+    if (!looped) return false;
+    channel.setLooping(*looped);
+    const std::optional<int> volume = StrictWholeNumber(slot.WaveVolume);
+    if (!volume) return false;
+    channel.setVolume(*volume);
+    const std::optional<int> pan = StrictWholeNumber(slot.WavePan);
+    if (!pan) return false;
+    channel.setPan(*pan);
+    slot.WavePlaying = BooleanText(true);
+    return channel.start();
+}
+
+void WavePlayback::StopWave(int note) {
+    if (!IsPad(note)) return;
+    WaveChannel& channel = channels_.channel(note);
+    if (!channel.isPlaying()) return;
+    channel.stop();
+    context_.NoteSlots[note].WavePlaying = BooleanText(false);
+}
+
+void WavePlayback::AllWaveSoundsOff() {
+    for (int note = kFirstPad; note <= kLastPad; ++note) StopWave(note);
+}
+
+void WavePlayback::OnPlaybackEnded(int note) {
+    if (IsPad(note)) context_.NoteSlots[note].WavePlaying = BooleanText(false);
+}

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <QObject>
+
+class Prompts;
+class WaveChannels;
+struct Context;
+
+// Starts and stops the pads' wave sounds with the settings of their slots and keeps each slot's
+// WavePlaying in step with its channel. Slots outside the pads have no channel and never sound.
+class WavePlayback : public QObject {
+    Q_OBJECT
+  public:
+    WavePlayback(Context& context, WaveChannels& channels, Prompts& prompts,
+                 QObject* parent = nullptr);
+
+    // Starts the pad's wave, or stops it when its channel already sounds. Does nothing for a slot
+    // without an assigned wave. A failure is reported and leaves the pad silent and not playing.
+    void PlayWave(int note);
+    // Stops the pad's wave if its channel sounds; a silent channel changes nothing.
+    void StopWave(int note);
+    void AllWaveSoundsOff();
+
+  private:
+    void OnPlaybackEnded(int note);
+    bool StartChannel(int note);
+
+    Context& context_;
+    WaveChannels& channels_;
+    Prompts& prompts_;
+};
