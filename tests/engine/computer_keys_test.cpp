@@ -1,0 +1,153 @@
+#include "engine/computer_keys.h"
+#include "dispatch_fixture.h"
+#include "engine/qt_key_codes.h"
+
+#include <QKeyEvent>
+
+namespace {
+
+struct ComputerKeysTest : DispatchTest {
+    QStringList commands;
+    QStringList keys;
+    ComputerKeyboard keyboard{
+        context, dispatcher,
+        ComputerKeyboard::Commands{
+            [this] { commands << "all sounds off"; }, [this] { commands << "transpose info"; },
+            [this] { commands << "zoom in"; }, [this] { commands << "zoom out"; },
+            [this] { commands << "scroll left"; }, [this] { commands << "scroll right"; },
+            [this](int note, bool pressed) {
+                keys << QString::number(note) + (pressed ? " down" : " up");
+            }}};
+
+    // Note-ons and note-offs the MIDI slots sent (bank, program and pan left out).
+    QStringList Notes() const {
+        QStringList notes;
+        for (const ShortMessage& m : midiOut.sent) {
+            if (m.status == 144)
+                notes << QStringLiteral("%1 %2").arg(m.data1).arg(m.data2 ? "on" : "off");
+        }
+        return notes;
+    }
+
+    void Feed(QEvent::Type type, int key, Qt::KeyboardModifiers modifiers = Qt::NoModifier,
+              bool autoRepeat = false) {
+        QKeyEvent event(type, key, modifiers, QString(), autoRepeat);
+        FeedKeyEvent(keyboard, event);
+    }
+};
+
+int Code(int key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
+    return VirtualKeyCode(QKeyEvent(QEvent::KeyPress, key, modifiers));
+}
+
+}  // namespace
+
+TEST_F(ComputerKeysTest, TheTwoRowsPlayThePads) {
+    const int codes[] = {90, 83, 88, 67, 70, 86, 71, 66, 78, 74, 77, 75, 188, 76, 190, 191};
+    for (int i = 0; i < 16; ++i) EXPECT_EQ(ComputerKeyboard::PadNoteForKey(codes[i]), 57 + i);
+    EXPECT_EQ(ComputerKeyboard::PadNoteForKey(65), -1);
+    EXPECT_EQ(ComputerKeyboard::PadNoteForKey(84), -1);
+
+    keyboard.KeyDown(67);  // C
+    keyboard.KeyUp(67);
+    EXPECT_EQ(Notes(), QStringList({"60 on", "60 off"}));
+    EXPECT_EQ(keys, QStringList({"60 down", "60 up"}));
+    EXPECT_EQ(midiOut.sent[3], (ShortMessage{144, 60, 127})) << "the slot's velocity is sent";
+}
+
+TEST_F(ComputerKeysTest, AHeldKeyPlaysOnceAndReleasesOnce) {
+    for (int i = 0; i < 5; ++i) keyboard.KeyDown(90);
+    EXPECT_EQ(context.QwertyKeyState[0], 1);
+    keyboard.KeyUp(90);
+    EXPECT_EQ(context.QwertyKeyState[0], 0);
+    EXPECT_EQ(Notes(), QStringList({"57 on", "57 off"}));
+
+    // T and the keypad keys act on every key-down, repeats included.
+    for (int i = 0; i < 3; ++i) keyboard.KeyDown(84);
+    keyboard.KeyDown(104);
+    keyboard.KeyDown(98);
+    keyboard.KeyDown(100);
+    keyboard.KeyDown(102);
+    keyboard.KeyDown(27);
+    EXPECT_EQ(commands,
+              QStringList({"transpose info", "transpose info", "transpose info", "zoom in",
+                           "zoom out", "scroll left", "scroll right", "all sounds off"}));
+}
+
+TEST_F(ComputerKeysTest, CtrlSilencesNoteKeysButNeverHoldsANote) {
+    keyboard.KeyDown(67);
+    keyboard.KeyDown(17);
+    keyboard.KeyDown(88);  // X with Ctrl: no sound
+    keyboard.KeyDown(84);  // nor commands
+    keyboard.KeyDown(27);  // Esc still works
+    keyboard.KeyUp(67);    // the note held before Ctrl still ends
+    keyboard.KeyUp(88);    // and releasing X still sends its note-off
+    keyboard.KeyUp(17);
+    EXPECT_FALSE(keyboard.CtrlKeyDown());
+    EXPECT_EQ(Notes(), QStringList({"60 on", "60 off", "59 off"}));
+    EXPECT_EQ(commands, QStringList({"all sounds off"}));
+
+    keyboard.KeyDown(88);
+    EXPECT_EQ(Notes().last(), "59 on");
+}
+
+TEST_F(ComputerKeysTest, DefaultVelocityZeroMakesPressesActAsReleases) {
+    context.DefaultMidiVelocity = 0;
+    MakeWavePad(60, "0");
+    keyboard.KeyDown(67);
+    EXPECT_EQ(Starts(60), 0);
+    keyboard.KeyDown(88);
+    EXPECT_EQ(Notes(), QStringList({"59 off"}));
+}
+
+TEST_F(ComputerKeysTest, QtKeysMapToTheTablesCodes) {
+    EXPECT_EQ(Code(Qt::Key_Z), 90);
+    EXPECT_EQ(Code(Qt::Key_Z, Qt::ShiftModifier), 90);
+    EXPECT_EQ(Code(Qt::Key_Comma), 188);
+    EXPECT_EQ(Code(Qt::Key_Less, Qt::ShiftModifier), 188);
+    EXPECT_EQ(Code(Qt::Key_Period), 190);
+    EXPECT_EQ(Code(Qt::Key_Greater, Qt::ShiftModifier), 190);
+    EXPECT_EQ(Code(Qt::Key_Slash), 191);
+    EXPECT_EQ(Code(Qt::Key_Question, Qt::ShiftModifier), 191);
+    EXPECT_EQ(Code(Qt::Key_Control, Qt::ControlModifier), 17);
+    EXPECT_EQ(Code(Qt::Key_Escape), 27);
+    EXPECT_EQ(Code(Qt::Key_T), 84);
+    // Keypad keys keep their own codes with Num Lock on or off; the main digits and arrows differ.
+    EXPECT_EQ(Code(Qt::Key_8, Qt::KeypadModifier), 104);
+    EXPECT_EQ(Code(Qt::Key_Up, Qt::KeypadModifier), 104);
+    EXPECT_EQ(Code(Qt::Key_2, Qt::KeypadModifier), 98);
+    EXPECT_EQ(Code(Qt::Key_Left, Qt::KeypadModifier), 100);
+    EXPECT_EQ(Code(Qt::Key_6, Qt::KeypadModifier), 102);
+    EXPECT_EQ(Code(Qt::Key_8), 56);
+    EXPECT_EQ(Code(Qt::Key_Up), 38);
+    EXPECT_EQ(Code(Qt::Key_F5), 116);
+    EXPECT_EQ(Code(Qt::Key_unknown), 0);
+}
+
+TEST_F(ComputerKeysTest, X11AutoRepeatPairsSoundOnceAndReleaseOnce) {
+    // X11 reports a held key as release/press pairs flagged as auto-repeat.
+    Feed(QEvent::KeyPress, Qt::Key_C);
+    for (int i = 0; i < 4; ++i) {
+        Feed(QEvent::KeyRelease, Qt::Key_C, Qt::NoModifier, true);
+        Feed(QEvent::KeyPress, Qt::Key_C, Qt::NoModifier, true);
+    }
+    Feed(QEvent::KeyRelease, Qt::Key_C);
+    EXPECT_EQ(Notes(), QStringList({"60 on", "60 off"}));
+    EXPECT_EQ(keys, QStringList({"60 down", "60 up"}));
+
+    Feed(QEvent::KeyPress, Qt::Key_8, Qt::KeypadModifier);
+    Feed(QEvent::KeyRelease, Qt::Key_8, Qt::KeypadModifier, true);
+    Feed(QEvent::KeyPress, Qt::Key_8, Qt::KeypadModifier, true);
+    Feed(QEvent::KeyRelease, Qt::Key_8, Qt::KeypadModifier);
+    EXPECT_EQ(commands, QStringList({"zoom in", "zoom in"}));
+
+    // Ctrl pressed and released through Qt events.
+    Feed(QEvent::KeyPress, Qt::Key_Control, Qt::ControlModifier);
+    Feed(QEvent::KeyPress, Qt::Key_X, Qt::ControlModifier);
+    EXPECT_TRUE(keyboard.CtrlKeyDown());
+    Feed(QEvent::KeyRelease, Qt::Key_X, Qt::ControlModifier);
+    Feed(QEvent::KeyRelease, Qt::Key_Control);
+    EXPECT_FALSE(keyboard.CtrlKeyDown());
+    EXPECT_EQ(Notes().last(), "59 off");
+    EXPECT_EQ(Notes().count("59 on"), 0);
+}
