@@ -14,32 +14,32 @@ NoteSlotTable PerformanceTable() {
     NoteSlotTable table;
     for (int note = 0; note < kSlotCount; ++note) {
         NoteSlot& slot = table[note];
-        slot = NoteSlot{QStringLiteral("0"),
-                        QStringLiteral("MIDI Note C %1  Acoustic Grand Piano").arg(note),
-                        NumberText(note),
-                        QStringLiteral("0"),
-                        QStringLiteral("127"),
-                        QStringLiteral("0"),
-                        QStringLiteral("0"),
-                        QStringLiteral("63"),
-                        QStringLiteral("0"),
-                        QStringLiteral("0"),
-                        QStringLiteral("0"),
-                        BooleanText(false),
-                        QStringLiteral("0"),
-                        BooleanText(false),
-                        BooleanText(false),
-                        QString(),
-                        BooleanText(false),
-                        BooleanText(false),
-                        QString(),
-                        QStringLiteral("0"),
-                        QStringLiteral("0")};
+        slot = NoteSlot{
+            .NoteFunction = QStringLiteral("0"),
+            .Description = QStringLiteral("MIDI Note C %1  Acoustic Grand Piano").arg(note),
+            .MidiNoteNumber = NumberText(note),
+            .MidiChannel = QStringLiteral("0"),
+            .MidiVelocity = QStringLiteral("127"),
+            .MidiPatch = QStringLiteral("0"),
+            .MidiBank = QStringLiteral("0"),
+            .MidiPan = QStringLiteral("63"),
+            .WaveVolume = QStringLiteral("0"),
+            .WavePan = QStringLiteral("0"),
+            .WaveFrequency = QStringLiteral("0"),
+            .WaveLooped = BooleanText(false),
+            .WavePlayMode = QStringLiteral("0"),
+            .WaveHoldToPlay = BooleanText(false),
+            .WaveToggleOnOff = BooleanText(false),
+            .WaveFileName = QString(),
+            .WaveAssigned = BooleanText(false),
+            .WavePlaying = BooleanText(false),
+            .Reserved1 = QString(),
+            .Reserved2 = QStringLiteral("0"),
+            .Reserved3 = QStringLiteral("0")};
         if (IsPad(note)) {
             slot.NoteFunction = QStringLiteral("1");
-            slot.WaveFileName = QStringLiteral("/home/player/Samples/Kit %1/pad %2.wav")
-                                    .arg(note / 4)
-                                    .arg(note);
+            slot.WaveFileName =
+                QStringLiteral("/home/player/Samples/Kit %1/pad %2.wav").arg(note / 4).arg(note);
             slot.Description = QStringLiteral("pad %1.wav  44100 Hz  16 bit  Stereo").arg(note);
             slot.WaveAssigned = BooleanText(true);
             slot.WaveVolume = QStringLiteral("-1200");
