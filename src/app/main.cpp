@@ -1,4 +1,4 @@
-#include "app/main_window.h"
+#include "app/application.h"
 
 #include <QApplication>
 
@@ -7,7 +7,7 @@ int main(int argc, char** argv) {
     qputenv("JACK_NO_START_SERVER", "1");
     QApplication app(argc, argv);
     QApplication::setApplicationName(QStringLiteral("Orvelle Quindara"));
-    MainWindow window;
-    window.show();
+    Application program(Backends::Real());
+    program.Start();
     return QApplication::exec();
 }

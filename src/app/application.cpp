@@ -1,0 +1,80 @@
+#include "app/application.h"
+
+#include "app/main_window.h"
+#include "components/audio/recording_wave_channels.h"
+#include "components/midi/rtmidi_input_port.h"
+#include "components/midi/rtmidi_output_port.h"
+#include "components/prompts/qt_prompts.h"
+#include "components/settings/qsettings_store.h"
+#include "engine/computer_keys.h"
+#include "engine/input_dispatcher.h"
+#include "engine/wave_playback.h"
+#include "midi/midi_input_pump.h"
+#include "midi/midi_setup.h"
+#include "midi/startup_device_check.h"
+#include "pickers/gm_names.h"
+
+Backends Backends::Real() {
+    Backends backends;
+    backends.settings = std::make_unique<QSettingsStore>();
+    backends.prompts = std::make_unique<QtPrompts>();
+    // Silent channels until the audio engine drives the pads.
+    backends.channels = std::make_unique<RecordingWaveChannels>();
+    backends.midiIn = std::make_unique<RtMidiInputPort>();
+    backends.midiOut = std::make_unique<RtMidiOutputPort>();
+    backends.instrumentList = GmNames::InstalledListFile(QStringLiteral("genmidi.txt"));
+    backends.drumList = GmNames::InstalledListFile(QStringLiteral("genmididrums.txt"));
+    return backends;
+}
+
+Application::Application(Backends backends, QObject* parent)
+    : QObject(parent), backends_(std::move(backends)) {
+    names_ =
+        std::make_unique<GmNames>(backends_.instrumentList, backends_.drumList, *backends_.prompts);
+    waves_ = std::make_unique<WavePlayback>(context_, *backends_.channels, *backends_.prompts);
+    dispatcher_ = std::make_unique<InputDispatcher>(context_, *backends_.midiOut, *waves_);
+    window_ = std::make_unique<MainWindow>();
+    if (auto* qtPrompts = dynamic_cast<QtPrompts*>(backends_.prompts.get())) {
+        qtPrompts->setParent(window_.get());
+    }
+
+    auto showStatus = [this](const QString& text) { window_->ShowStatus(text); };
+    auto showKey = [this](int note, bool pressed) { window_->ShowKey(note, pressed); };
+    midiSetup_ = std::make_unique<MidiSetup>(context_, *backends_.midiIn, *backends_.midiOut,
+                                             showStatus, showKey);
+    pump_ = std::make_unique<MidiInputPump>(*backends_.midiIn, *dispatcher_, showKey);
+
+    ComputerKeyboard::Commands commands;
+    commands.allSoundsOff = [this] { AllSoundsOff(); };
+    commands.showKey = showKey;
+    keyboard_ = std::make_unique<ComputerKeyboard>(context_, *dispatcher_, commands);
+    window_->SetKeyboard(keyboard_.get());
+    connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
+}
+
+Application::~Application() {
+    Shutdown();
+}
+
+void Application::Start() {
+    GetStartupDefaults(context_, *backends_.settings);
+    InitializeAllMidiNotes(context_, *names_, *backends_.channels);
+    context_.GlobalTranspose = 0;
+    context_.CurrentFileName.clear();
+    // The MIDI setup dialog joins here when it exists; until then the question alone is asked.
+    RunStartupMidiCheck(*midiSetup_, context_, *backends_.settings, *backends_.prompts, {});
+    window_->show();
+}
+
+void Application::Shutdown() {
+    if (shutDown_) return;
+    shutDown_ = true;
+    for (int note = kFirstPad; note <= kLastPad; ++note) backends_.channels->channel(note).close();
+    midiSetup_->CloseMidiInPort();
+    midiSetup_->CloseMidiOutPort();
+}
+
+void Application::AllSoundsOff() {
+    waves_->AllWaveSoundsOff();
+    midiSetup_->AllMidiNotesOff();
+}

@@ -1,0 +1,70 @@
+#pragma once
+
+#include "components/audio/wave_channel.h"
+#include "components/midi/midi_port.h"
+#include "components/prompts/prompts.h"
+#include "components/settings/settings_store.h"
+#include "engine/note_slots.h"
+
+#include <QObject>
+
+#include <memory>
+
+class ComputerKeyboard;
+class GmNames;
+class InputDispatcher;
+class MainWindow;
+class MidiInputPump;
+class MidiSetup;
+class WavePlayback;
+
+// The outside components the program runs on: real ones in main(), test backends in tests.
+struct Backends {
+    std::unique_ptr<SettingsStore> settings;
+    std::unique_ptr<Prompts> prompts;
+    std::unique_ptr<WaveChannels> channels;
+    std::unique_ptr<MidiInputPort> midiIn;
+    std::unique_ptr<MidiOutputPort> midiOut;
+    QString instrumentList;
+    QString drumList;
+
+    // RtMidi ports, the user's settings, Qt's message boxes and the installed name lists.
+    static Backends Real();
+};
+
+// Builds every part of the program around one Context, runs start-up in its fixed order and
+// shuts down in reverse.
+class Application : public QObject {
+    Q_OBJECT
+  public:
+    explicit Application(Backends backends, QObject* parent = nullptr);
+    ~Application() override;
+
+    // Settings defaults, the table reset, the MIDI device check; then the window is shown.
+    void Start();
+    // Silences and releases the pads' channels and closes both MIDI ports.
+    void Shutdown();
+
+    Context& context() { return context_; }
+    MainWindow& window() { return *window_; }
+    InputDispatcher& dispatcher() { return *dispatcher_; }
+    ComputerKeyboard& keyboard() { return *keyboard_; }
+    MidiSetup& midiSetup() { return *midiSetup_; }
+    WavePlayback& waves() { return *waves_; }
+    Backends& backends() { return backends_; }
+
+    // Esc and "All Sounds Off": every pad silenced, then every MIDI note ended.
+    void AllSoundsOff();
+
+  private:
+    Context context_;
+    Backends backends_;
+    std::unique_ptr<GmNames> names_;
+    std::unique_ptr<WavePlayback> waves_;
+    std::unique_ptr<InputDispatcher> dispatcher_;
+    std::unique_ptr<MainWindow> window_;
+    std::unique_ptr<MidiSetup> midiSetup_;
+    std::unique_ptr<MidiInputPump> pump_;
+    std::unique_ptr<ComputerKeyboard> keyboard_;
+    bool shutDown_ = false;
+};

@@ -1,0 +1,124 @@
+#include "app/application.h"
+#include "app/main_window.h"
+#include "components/audio/recording_wave_channels.h"
+#include "components/midi/loopback_midi.h"
+#include "components/prompts/scripted_prompts.h"
+#include "components/settings/memory_settings_store.h"
+
+#include <QLineEdit>
+#include <QSignalSpy>
+#include <QTest>
+#include <QVBoxLayout>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+// The whole program over test backends: loopback MIDI, recording channels, scripted prompts.
+struct ProgramTest : ::testing::Test {
+    MemorySettingsStore* settings = new MemorySettingsStore;
+    ScriptedPrompts* prompts = new ScriptedPrompts;
+    RecordingWaveChannels* channels = new RecordingWaveChannels;
+    LoopbackMidiInput* midiIn = new LoopbackMidiInput({QStringLiteral("Keys")});
+    LoopbackMidiOutput* midiOut =
+        new LoopbackMidiOutput({QStringLiteral("Synth"), QStringLiteral("Drums")});
+    std::unique_ptr<Application> program;
+
+    void Build() {
+        Backends backends;
+        backends.settings.reset(settings);
+        backends.prompts.reset(prompts);
+        backends.channels.reset(channels);
+        backends.midiIn.reset(midiIn);
+        backends.midiOut.reset(midiOut);
+        backends.instrumentList = QStringLiteral(OQ_SOURCE_DATA_DIR "/genmidi.txt");
+        backends.drumList = QStringLiteral(OQ_SOURCE_DATA_DIR "/genmididrums.txt");
+        program = std::make_unique<Application>(std::move(backends));
+    }
+
+    void StoreDevices(int in, int out) {
+        settings->setValue("MIDI", "MIDI_Error_Check", "14");  // "Keys" + "Synth" + "Drums"
+        settings->setValue("MIDI", "MIDI_Input", QString::number(in));
+        settings->setValue("MIDI", "MIDI_Output", QString::number(out));
+    }
+};
+
+}  // namespace
+
+TEST_F(ProgramTest, FirstRunAsksForDevicesAndStartsWithTheDefaultTable) {
+    Build();
+    program->Start();
+    EXPECT_EQ(program->window().windowTitle(), "Tarvik Radio - Orvelle Quindara - Untitled");
+    ASSERT_EQ(prompts->shownMessages.size(), 1);
+    EXPECT_EQ(prompts->shownMessages[0].title, "MIDI Settings change detected");
+    EXPECT_EQ(prompts->shownMessages[0].text, "Please select your MIDI devices now...");
+    EXPECT_FALSE(midiIn->isOpen());
+    EXPECT_FALSE(midiOut->isOpen());
+    EXPECT_EQ(program->context().NoteSlots[60].Description, "MIDI Note C 60  Acoustic Grand Piano");
+    EXPECT_EQ(program->context().NoteSlots[127].MidiVelocity, "127");
+}
+
+TEST_F(ProgramTest, StoredDevicesOpenAndNotesFlowFromMidiInToMidiOut) {
+    StoreDevices(0, 1);
+    settings->setValue("Defaults", "MidiChannel", "2");
+    Build();
+    program->Start();
+    EXPECT_TRUE(prompts->shownMessages.isEmpty());
+    ASSERT_TRUE(midiIn->isOpen());
+    ASSERT_TRUE(midiOut->isOpen());
+    EXPECT_EQ(midiOut->deviceIndex(), 1);
+    ASSERT_EQ(midiOut->sent.size(), 1u);
+    EXPECT_EQ(midiOut->sent[0], (ShortMessage{178, 7, 100}))
+        << "main volume on the default channel";
+
+    midiOut->sent.clear();
+    midiIn->inject({144, 60, 90});
+    midiIn->inject({144, 30, 90});  // not a pad: dropped
+    ASSERT_TRUE(QTest::qWaitFor([&] { return midiOut->sent.size() >= 4; }, 5000));
+    EXPECT_EQ(midiOut->sent.back(), (ShortMessage{146, 60, 127}));
+    EXPECT_TRUE(program->window().KeyShownPressed(60));
+    midiIn->inject({144, 60, 0});
+    ASSERT_TRUE(QTest::qWaitFor([&] { return !program->window().KeyShownPressed(60); }, 5000));
+    EXPECT_EQ(midiOut->sent.back(), (ShortMessage{146, 60, 0}));
+    EXPECT_EQ(midiOut->sent.size(), 5u);
+}
+
+TEST_F(ProgramTest, ComputerKeysReachThePadsWhicheverControlHasTheFocus) {
+    StoreDevices(0, 0);
+    Build();
+    program->Start();
+    MainWindow& window = program->window();
+    auto* field = new QLineEdit;
+    window.setCentralWidget(field);
+    window.activateWindow();
+    field->setFocus();
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(&window));
+    midiOut->sent.clear();
+
+    QTest::keyPress(field, Qt::Key_C);
+    EXPECT_EQ(midiOut->sent.size(), 4u);
+    EXPECT_TRUE(window.KeyShownPressed(60));
+    QTest::keyRelease(field, Qt::Key_C);
+    EXPECT_EQ(midiOut->sent.back(), (ShortMessage{144, 60, 0}));
+    EXPECT_FALSE(window.KeyShownPressed(60));
+    EXPECT_TRUE(field->text().isEmpty()) << "the note key never types into the field";
+
+    // Esc: every pad silenced, then the 2048-message sweep.
+    midiOut->sent.clear();
+    QTest::keyClick(field, Qt::Key_Escape);
+    EXPECT_EQ(midiOut->sent.size(), 2048u);
+}
+
+TEST_F(ProgramTest, ClosingTheWindowReleasesChannelsAndClosesBothPorts) {
+    StoreDevices(0, 0);
+    Build();
+    program->Start();
+    channels->log.clear();
+    program->window().close();
+    EXPECT_FALSE(midiIn->isOpen());
+    EXPECT_FALSE(midiOut->isOpen());
+    EXPECT_EQ(channels->log.size(), 16);
+    EXPECT_EQ(channels->log.first(), "57 close");
+    program.reset();  // a second shutdown from the destructor does nothing more
+    EXPECT_EQ(channels->log.size(), 16);
+}
