@@ -1,0 +1,131 @@
+#include "components/midi/loopback_midi.h"
+
+#include <QTest>
+#include <QThread>
+
+#include <gtest/gtest.h>
+
+#include <thread>
+#include <vector>
+
+namespace {
+
+ShortMessage Numbered(int i) {
+    return {static_cast<std::uint8_t>(0x90 | (i >> 14 & 0x0F)),
+            static_cast<std::uint8_t>(i >> 7 & 0x7F), static_cast<std::uint8_t>(i & 0x7F)};
+}
+
+std::vector<ShortMessage> Drain(MidiInputPort& port) {
+    std::vector<ShortMessage> messages;
+    ShortMessage message;
+    while (port.queueLength() > 0 && port.head(message)) {
+        messages.push_back(message);
+        port.removeHead();
+    }
+    return messages;
+}
+
+}  // namespace
+
+TEST(LoopbackMidiOutput, OpensListedDevicesOnlyAndRecordsWhileOpen) {
+    LoopbackMidiOutput out({QStringLiteral("Synth A"), QStringLiteral("Synth B")});
+    EXPECT_EQ(out.deviceCount(), 2);
+    EXPECT_EQ(out.deviceIndex(), -1);
+
+    out.send({144, 60, 100});  // closed: nothing goes anywhere
+    EXPECT_FALSE(out.open(2));
+    EXPECT_FALSE(out.errorText().isEmpty());
+    EXPECT_FALSE(out.isOpen());
+    EXPECT_FALSE(out.open(-1));
+
+    ASSERT_TRUE(out.open(1));
+    EXPECT_EQ(out.deviceIndex(), 1);
+    EXPECT_TRUE(out.errorText().isEmpty());
+    out.send({176, 7, 100});
+    out.send({144, 60, 0});
+    out.close();
+    out.send({144, 61, 0});
+    EXPECT_EQ(out.sent, (std::vector<ShortMessage>{{176, 7, 100}, {144, 60, 0}}));
+}
+
+TEST(LoopbackMidiInput, QueuesInOrderOnlyWhileOpenAndForgetsOnReopen) {
+    LoopbackMidiInput in({QStringLiteral("Keys")});
+    in.inject({144, 60, 1});
+    EXPECT_EQ(in.queueLength(), 0);
+    ShortMessage message;
+    EXPECT_FALSE(in.head(message));
+    EXPECT_FALSE(in.open(1));
+
+    ASSERT_TRUE(in.open(0));
+    LoopbackMidiOutput out({QStringLiteral("Through")});
+    out.connectTo(&in);
+    ASSERT_TRUE(out.open(0));
+    out.send({144, 60, 100});
+    in.inject({128, 60, 0});
+    EXPECT_EQ(in.queueLength(), 2);
+    ASSERT_TRUE(in.head(message));
+    EXPECT_EQ(message, (ShortMessage{144, 60, 100}));
+    in.removeHead();
+    ASSERT_TRUE(in.head(message));
+    EXPECT_EQ(message, (ShortMessage{128, 60, 0}));
+
+    // A fresh opening starts with an empty queue.
+    ASSERT_TRUE(in.open(0));
+    EXPECT_EQ(in.queueLength(), 0);
+    in.removeHead();  // harmless on an empty queue
+    EXPECT_EQ(in.queueLength(), 0);
+}
+
+TEST(LoopbackMidiInput, FullQueueDropsNewestAndCountsThem) {
+    LoopbackMidiInput in({QStringLiteral("Keys")});
+    ASSERT_TRUE(in.open(0));
+    const int capacity = static_cast<int>(QueuedMidiInput::kQueueCapacity) - 1;
+    for (int i = 0; i < capacity + 10; ++i) in.inject(Numbered(i));
+
+    EXPECT_EQ(in.queueLength(), capacity);
+    EXPECT_EQ(in.droppedMessages(), 10u);
+    const std::vector<ShortMessage> kept = Drain(in);
+    ASSERT_EQ(kept.size(), static_cast<std::size_t>(capacity));
+    EXPECT_EQ(kept.front(), Numbered(0));
+    EXPECT_EQ(kept.back(), Numbered(capacity - 1));
+
+    // Room again once drained.
+    in.inject(Numbered(7));
+    EXPECT_EQ(Drain(in), (std::vector<ShortMessage>{Numbered(7)}));
+}
+
+// The producer is another thread, as a MIDI system's callback is; the reader only ever runs on
+// the user-interface thread, woken through the event loop.
+TEST(LoopbackMidiInput, MessagesFromAnotherThreadReachTheEventLoopInOrder) {
+    LoopbackMidiInput in({QStringLiteral("Keys")});
+    ASSERT_TRUE(in.open(0));
+    std::vector<ShortMessage> received;
+    bool readOffUiThread = false;
+    int wakeUps = 0;
+    QObject::connect(&in, &MidiInputPort::messagesWaiting, [&] {
+        ++wakeUps;
+        readOffUiThread |= QThread::currentThread() != qApp->thread();
+        for (const ShortMessage& message : Drain(in)) received.push_back(message);
+    });
+
+    // More than the queue holds, in bursts the reader has to keep up with.
+    constexpr int kCount = 20000;
+    std::thread producer([&] {
+        for (int i = 0; i < kCount; ++i) {
+            while (in.queueLength() > 3000) std::this_thread::yield();
+            in.inject(Numbered(i));
+        }
+    });
+    const bool arrived = QTest::qWaitFor([&] { return received.size() >= kCount; }, 10000);
+    producer.join();
+    QCoreApplication::processEvents();
+
+    ASSERT_TRUE(arrived) << received.size() << " of " << kCount;
+    EXPECT_EQ(in.droppedMessages(), 0u);
+    EXPECT_FALSE(readOffUiThread);
+    EXPECT_GT(wakeUps, 0);
+    for (int i = 0; i < kCount; ++i) {
+        ASSERT_EQ(received[i], Numbered(i)) << "message " << i;
+    }
+    EXPECT_EQ(received.size(), static_cast<std::size_t>(kCount));
+}

@@ -1,0 +1,61 @@
+#include "components/midi/rtmidi_client.h"
+#include "components/midi/rtmidi_input_port.h"
+#include "components/midi/rtmidi_output_port.h"
+
+#include <QFile>
+
+#include <gtest/gtest.h>
+
+TEST(RtMidiBackend, SendsOnlyTheBytesEachStatusCallsFor) {
+    // A trailing 0 after a program change would be read as a second change to program 0.
+    EXPECT_EQ(WireLength({195, 5, 0}), 2);
+    EXPECT_EQ(WireLength({208, 40, 0}), 2);
+    EXPECT_EQ(WireLength({147, 60, 100}), 3);
+    EXPECT_EQ(WireLength({179, 10, 63}), 3);
+    EXPECT_EQ(WireLength({224, 0, 64}), 3);
+    EXPECT_EQ(WireLength({0xF8, 0, 0}), 1);
+    EXPECT_EQ(WireLength({0xF3, 2, 0}), 2);
+    // Not sendable as a short message: no status, a data byte that is a status, system exclusive.
+    EXPECT_EQ(WireLength({60, 100, 0}), 0);
+    EXPECT_EQ(WireLength({144, 200, 100}), 0);
+    EXPECT_EQ(WireLength({176, 7, 128}), 0);
+    EXPECT_EQ(WireLength({0xF0, 1, 2}), 0);
+}
+
+TEST(RtMidiBackend, RecognisesTheProgramsOwnPortsOnly) {
+    EXPECT_TRUE(IsOwnPort("Orvelle Quindara MIDI Out:out"));
+    EXPECT_TRUE(IsOwnPort("Orvelle Quindara MIDI In:in"));
+    EXPECT_TRUE(IsOwnPort("Orvelle Quindara MIDI Out-01:out"));   // JACK's name for a second copy
+    EXPECT_TRUE(IsOwnPort("Orvelle Quindara MIDI In:in 129:0"));  // the ALSA form
+    EXPECT_FALSE(IsOwnPort("system:midi_capture_1"));
+    EXPECT_FALSE(IsOwnPort("Orvelle Quindara MIDI Output Monitor:in"));
+    EXPECT_FALSE(IsOwnPort("a2j:Orvelle Quindara MIDI Out [130] (capture): out"));
+}
+
+// Without the ALSA sequencer and with no JACK server of that name, the backend behaves like a
+// computer without MIDI devices: nothing to list, opening fails with a reason, nothing throws.
+TEST(RtMidiBackend, WithoutAnyMidiSystemThereAreNoDevices) {
+    if (QFile::exists(QStringLiteral("/dev/snd/seq"))) GTEST_SKIP() << "an ALSA sequencer is here";
+    const QByteArray savedServer = qgetenv("JACK_DEFAULT_SERVER");
+    qputenv("JACK_DEFAULT_SERVER", "oq-no-such-server");
+    {
+        RtMidiInputPort in;
+        RtMidiOutputPort out;
+        EXPECT_EQ(in.deviceCount(), 0);
+        EXPECT_EQ(out.deviceCount(), 0);
+        EXPECT_FALSE(in.open(0));
+        EXPECT_FALSE(in.errorText().isEmpty());
+        EXPECT_FALSE(in.isOpen());
+        EXPECT_FALSE(out.open(0));
+        EXPECT_FALSE(out.errorText().isEmpty());
+        EXPECT_EQ(out.deviceIndex(), -1);
+        out.send({144, 60, 100});
+        in.close();
+        out.close();
+    }
+    if (savedServer.isNull()) {
+        qunsetenv("JACK_DEFAULT_SERVER");
+    } else {
+        qputenv("JACK_DEFAULT_SERVER", savedServer);
+    }
+}
