@@ -1,0 +1,53 @@
+#pragma once
+
+#include <QString>
+
+#include <functional>
+
+class MidiInputPort;
+class MidiOutputPort;
+struct Context;
+
+// Shows a short notice in the main window's status bar.
+using StatusTextFunction = std::function<void(const QString& text)>;
+// Shows the on-screen key of a pad note (57..72) pressed or raised.
+using KeyDisplayFunction = std::function<void(int note, bool pressed)>;
+
+// The program's MIDI port operations: device checks, the device fingerprint, opening and
+// closing the two ports, the all-notes-off sweep and the main-volume message. Device indices
+// and availability live in the Context, where the setup dialog and start-up find them.
+class MidiSetup {
+  public:
+    MidiSetup(Context& context, MidiInputPort& midiIn, MidiOutputPort& midiOut,
+              StatusTextFunction showStatus, KeyDisplayFunction showKey);
+
+    void CheckMidiDevices();
+    // Adds the name lengths of every In device, then every Out device, to
+    // MidiDeviceNamesLength. The caller resets it first.
+    void VerifyMidiDevices();
+
+    // Opens the chosen device. A missing device, or a stored index that no longer names one,
+    // leaves the port closed and says so in the status bar.
+    void OpenMidiInPort();
+    void OpenMidiOutPort();
+    void CloseMidiInPort();
+    void CloseMidiOutPort();
+
+    // A note-on with velocity 0 for every note on every channel, then all pad keys raised.
+    void AllMidiNotesOff();
+    // Controller 7 with MidiMainVolume on the default channel.
+    void SetMidiMainVolume();
+
+    MidiInputPort& midiIn() { return midiIn_; }
+    MidiOutputPort& midiOut() { return midiOut_; }
+
+  private:
+    void Send(int status, int data1, int data2);
+    void ShowStatus(const QString& text);
+
+    Context& context_;
+    MidiInputPort& midiIn_;
+    MidiOutputPort& midiOut_;
+    StatusTextFunction showStatus_;
+    KeyDisplayFunction showKey_;
+};
