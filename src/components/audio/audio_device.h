@@ -5,14 +5,14 @@
 // What a sound device asks of the program on its real-time thread. Implementations never
 // allocate, lock, log or touch a file in these calls.
 class AudioRenderer {
-public:
+  public:
     virtual ~AudioRenderer() = default;
     // Fill `frames` interleaved stereo frames (left, right) of float samples in -1..1.
     virtual void render(float* stereo, int frames) noexcept = 0;
 };
 
 class AudioCaptureSink {
-public:
+  public:
     virtual ~AudioCaptureSink() = default;
     // `frames` interleaved frames of `channels` float samples, as the device recorded them.
     virtual void capture(const float* samples, int frames, int channels) noexcept = 0;
@@ -28,7 +28,7 @@ struct AudioStreamFormat {
 // A playback stream: stereo, float, at the device's own rate. start() begins calling the
 // renderer on the device's thread once per period.
 class AudioOutputDevice {
-public:
+  public:
     virtual ~AudioOutputDevice() = default;
     virtual bool start(AudioRenderer& renderer) = 0;
     virtual void stop() = 0;
@@ -41,7 +41,7 @@ public:
 
 // A recording stream at the device's own rate, mono or stereo.
 class AudioInputDevice {
-public:
+  public:
     virtual ~AudioInputDevice() = default;
     virtual bool start(AudioCaptureSink& sink) = 0;
     virtual void stop() = 0;

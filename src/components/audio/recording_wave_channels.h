@@ -11,7 +11,7 @@
 // one line per call ("60 file /a.wav", "60 start", ...). A test can make loading fail and can
 // end a sound as the audio thread would.
 class RecordingWaveChannel : public WaveChannel {
-public:
+  public:
     RecordingWaveChannel(int note, QStringList& log) : note_(note), log_(log) {}
 
     bool setFileName(const QString& path) override;
@@ -36,7 +36,7 @@ public:
 
     void finishPlayback() { playing_ = false; }
 
-private:
+  private:
     void record(const QString& what);
 
     int note_;
@@ -48,7 +48,7 @@ private:
 
 class RecordingWaveChannels : public WaveChannels {
     Q_OBJECT
-public:
+  public:
     explicit RecordingWaveChannels(QObject* parent = nullptr);
     RecordingWaveChannel& channel(int padNote) override;
 
@@ -57,6 +57,6 @@ public:
 
     QStringList log;
 
-private:
+  private:
     std::array<std::unique_ptr<RecordingWaveChannel>, 16> channels_;
 };

@@ -6,7 +6,7 @@
 // One pad's wave channel. Units: frequency in Hz (0 = the file's own rate), volume in
 // hundredths of a decibel (-5000..0), pan -10000 (left)..10000 (right).
 class WaveChannel {
-public:
+  public:
     virtual ~WaveChannel() = default;
 
     // Loads the file for the next start; "" unloads. False (and an error text) when it cannot load.
@@ -31,11 +31,11 @@ public:
 // The sixteen pad channels, indexed by pad note 57..72, and the end-of-playback notice.
 class WaveChannels : public QObject {
     Q_OBJECT
-public:
+  public:
     using QObject::QObject;
     virtual WaveChannel& channel(int padNote) = 0;
 
-signals:
+  signals:
     // A non-looped sound ended by itself; delivered on the user-interface thread.
     void playbackEnded(int padNote);
 };
