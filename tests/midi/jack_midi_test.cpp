@@ -29,9 +29,9 @@ bool WaitFor(const std::function<bool()>& done) {
 }  // namespace
 
 TEST_F(JackMidiTest, SlotMessagesLeaveThroughTheMidiOutPort) {
-    JackPeerInput soundModule;
+    JackPeer soundModule;
     RtMidiOutputPort jackOut;
-    const int device = jackOut.deviceNames().indexOf(soundModule.portName());
+    const int device = jackOut.deviceNames().indexOf(soundModule.listeningPort());
     ASSERT_GE(device, 0) << jackOut.deviceNames().join(", ").toStdString();
     ASSERT_TRUE(jackOut.open(device)) << jackOut.errorText().toStdString();
 
@@ -46,9 +46,9 @@ TEST_F(JackMidiTest, SlotMessagesLeaveThroughTheMidiOutPort) {
 }
 
 TEST_F(JackMidiTest, MessagesIntoTheMidiInPortArePumpedToTheDispatcherInOrder) {
-    JackPeerOutput keyboard;
+    JackPeer keyboard;
     RtMidiInputPort jackIn;
-    const int device = jackIn.deviceNames().indexOf(keyboard.portName());
+    const int device = jackIn.deviceNames().indexOf(keyboard.playingPort());
     ASSERT_GE(device, 0) << jackIn.deviceNames().join(", ").toStdString();
     ASSERT_TRUE(jackIn.open(device)) << jackIn.errorText().toStdString();
     midiOut.setDeviceNames({QStringLiteral("Synth")});
@@ -77,8 +77,7 @@ TEST_F(JackMidiTest, MessagesIntoTheMidiInPortArePumpedToTheDispatcherInOrder) {
 // With JACK, the program's MIDI Out port is a source for everyone else and its MIDI In port a
 // destination; the program's own lists, and so the fingerprint, must not change with them.
 TEST_F(JackMidiTest, OwnPortsNeverShowAmongTheDevices) {
-    JackPeerInput soundModule;
-    JackPeerOutput keyboard;
+    JackPeer peer;
     RtMidiInputPort jackIn;
     RtMidiOutputPort jackOut;
     MidiSetup jackSetup{
@@ -88,8 +87,8 @@ TEST_F(JackMidiTest, OwnPortsNeverShowAmongTheDevices) {
         jackSetup.VerifyMidiDevices();
         return context.MidiDeviceNamesLength;
     };
-    context.MidiInDevice = static_cast<int>(jackIn.deviceNames().indexOf(keyboard.portName()));
-    context.MidiOutDevice = static_cast<int>(jackOut.deviceNames().indexOf(soundModule.portName()));
+    context.MidiInDevice = static_cast<int>(jackIn.deviceNames().indexOf(peer.playingPort()));
+    context.MidiOutDevice = static_cast<int>(jackOut.deviceNames().indexOf(peer.listeningPort()));
 
     // Test programs running beside this one may add or remove ports in between; a filter that
     // lets our own ports through makes every attempt differ.
@@ -109,8 +108,8 @@ TEST_F(JackMidiTest, OwnPortsNeverShowAmongTheDevices) {
         EXPECT_FALSE(name.startsWith(QStringLiteral("Orvelle Quindara"))) << name.toStdString();
     }
     // The others do see them.
-    EXPECT_EQ(soundModule.sources().filter(QStringLiteral("Orvelle Quindara MIDI Out")).size(), 1);
-    EXPECT_EQ(keyboard.destinations().filter(QStringLiteral("Orvelle Quindara MIDI In")).size(), 1);
+    EXPECT_EQ(peer.sources().filter(QStringLiteral("Orvelle Quindara MIDI Out")).size(), 1);
+    EXPECT_EQ(peer.destinations().filter(QStringLiteral("Orvelle Quindara MIDI In")).size(), 1);
 
     // A device index that no longer exists fails cleanly and leaves the port closed.
     context.MidiOutDevice = jackOut.deviceCount() + 3;

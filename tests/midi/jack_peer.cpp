@@ -1,7 +1,6 @@
 #include "jack_peer.h"
 
 #include <QCoreApplication>
-#include <QStringList>
 
 #ifdef OQ_HAVE_JACK
 #include <jack/jack.h>
@@ -9,8 +8,12 @@
 
 namespace {
 
-template <class Client>
-QStringList PortNames(Client& midi) {
+std::string ClientName(const char* role) {
+    return "oq-test-" + std::string(role) + "-" +
+           std::to_string(QCoreApplication::applicationPid());
+}
+
+QStringList PortNames(RtMidi& midi) {
     QStringList names;
     for (unsigned int i = 0; i < midi.getPortCount(); ++i) {
         names.append(QString::fromStdString(midi.getPortName(i)));
@@ -35,54 +38,41 @@ bool JackServerReachable() {
 #endif
 }
 
-// Unique per test process, so test programs running side by side do not share a peer.
-std::string JackPeer::ClientName(const char* role) {
-    return "oq-test-" + std::string(role) + "-" +
-           std::to_string(QCoreApplication::applicationPid());
+JackPeer::JackPeer()
+    : listener_(RtMidi::UNIX_JACK, ClientName("listener")),
+      player_(RtMidi::UNIX_JACK, ClientName("player")) {
+    listener_.setCallback(&JackPeer::OnMessage, this);
+    listener_.openVirtualPort("from-program");
+    player_.openVirtualPort("to-program");
 }
 
-QString JackPeer::portName() const {
-    return QString::fromStdString(clientName_ + ":" + port_);
+QString JackPeer::listeningPort() const {
+    return QString::fromStdString(ClientName("listener") + ":from-program");
 }
 
-JackPeerInput::JackPeerInput() {
-    clientName_ = ClientName("listener");
-    port_ = "from-program";
-    midi_ = std::make_unique<RtMidiIn>(RtMidi::UNIX_JACK, clientName_);
-    midi_->setCallback(&JackPeerInput::OnMessage, this);
-    midi_->openVirtualPort(port_);
+QString JackPeer::playingPort() const {
+    return QString::fromStdString(ClientName("player") + ":to-program");
 }
 
-void JackPeerInput::OnMessage(double, std::vector<unsigned char>* bytes, void* self) {
-    auto* peer = static_cast<JackPeerInput*>(self);
+void JackPeer::OnMessage(double, std::vector<unsigned char>* bytes, void* self) {
     ShortMessage message;
     message.status = bytes->at(0);
     if (bytes->size() > 1) message.data1 = (*bytes)[1];
     if (bytes->size() > 2) message.data2 = (*bytes)[2];
+    auto* peer = static_cast<JackPeer*>(self);
     std::lock_guard lock(peer->mutex_);
     peer->received_.push_back(message);
 }
 
-std::vector<ShortMessage> JackPeerInput::received() const {
+std::vector<ShortMessage> JackPeer::received() const {
     std::lock_guard lock(mutex_);
     return received_;
 }
 
-QStringList JackPeerInput::sources() {
-    return PortNames(*midi_);
+QStringList JackPeer::sources() {
+    return PortNames(listener_);
 }
 
-JackPeerOutput::JackPeerOutput() {
-    clientName_ = ClientName("player");
-    port_ = "to-program";
-    midi_ = std::make_unique<RtMidiOut>(RtMidi::UNIX_JACK, clientName_);
-    midi_->openVirtualPort(port_);
-}
-
-void JackPeerOutput::send(std::vector<unsigned char> bytes) {
-    midi_->sendMessage(&bytes);
-}
-
-QStringList JackPeerOutput::destinations() {
-    return PortNames(*midi_);
+QStringList JackPeer::destinations() {
+    return PortNames(player_);
 }

@@ -2,13 +2,11 @@
 
 #include "components/midi/midi_port.h"
 
-#include <QString>
+#include <QStringList>
 
 #include <rtmidi/RtMidi.h>
 
-#include <memory>
 #include <mutex>
-#include <string>
 #include <vector>
 
 // True when a JACK server answers; never starts one and stays quiet when there is none.
@@ -25,40 +23,27 @@ bool JackServerReachable();
         }                                                                                     \
     } while (false)
 
-// Another JACK MIDI program: a client of its own with one virtual port that the program sees
-// as a device.
+// Another JACK MIDI program with a virtual port in each direction, which the program sees as a
+// MIDI Out and a MIDI In device. Its client names hold the process id, so test programs
+// running side by side do not share a peer.
 class JackPeer {
   public:
-    QString portName() const;
+    JackPeer();
 
-  protected:
-    static std::string ClientName(const char* role);
-    std::string clientName_;
-    std::string port_;
-};
+    QString listeningPort() const;  // a MIDI Out device to the program
+    QString playingPort() const;    // a MIDI In device to the program
 
-// Receives whatever the program's MIDI Out sends to it.
-class JackPeerInput : public JackPeer {
-  public:
-    JackPeerInput();
+    void send(std::vector<unsigned char> bytes) { player_.sendMessage(&bytes); }
     std::vector<ShortMessage> received() const;
-    // Names of the ports this client could listen to.
+    // The ports this peer could listen to and play into.
     QStringList sources();
-
-  private:
-    static void OnMessage(double, std::vector<unsigned char>* bytes, void* self);
-    mutable std::mutex mutex_;
-    std::vector<ShortMessage> received_;
-    std::unique_ptr<RtMidiIn> midi_;
-};
-
-// Sends into the program's MIDI In.
-class JackPeerOutput : public JackPeer {
-  public:
-    JackPeerOutput();
-    void send(std::vector<unsigned char> bytes);
     QStringList destinations();
 
   private:
-    std::unique_ptr<RtMidiOut> midi_;
+    static void OnMessage(double, std::vector<unsigned char>* bytes, void* self);
+
+    RtMidiIn listener_;
+    RtMidiOut player_;
+    mutable std::mutex mutex_;
+    std::vector<ShortMessage> received_;
 };

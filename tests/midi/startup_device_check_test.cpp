@@ -80,17 +80,3 @@ TEST_F(StartupDeviceCheckTest, NoDevicesAreReportedAndBothOpensSayWhatIsMissing)
                                         QStringLiteral("No avaliable Midi Out Devices detected")}));
     EXPECT_EQ(dialogsShown, 0);
 }
-
-TEST_F(StartupDeviceCheckTest, StoredIndexOfAVanishedDeviceLeavesThatPortClosed) {
-    midiIn.setDeviceNames({QStringLiteral("Keys")});
-    midiOut.setDeviceNames({QStringLiteral("Synth")});
-    Store("MIDI_Error_Check", "9");
-    Store("MIDI_Input", "4");
-    Store("MIDI_Output", "0");
-
-    EXPECT_EQ(Run(), StartupMidiOutcome::PortsOpened);
-    EXPECT_FALSE(midiIn.isOpen());
-    EXPECT_TRUE(midiOut.isOpen());
-    EXPECT_EQ(statusTexts, (QStringList{QStringLiteral("No avaliable Midi In Devices detected")}));
-    EXPECT_EQ(midiOut.sent.size(), 1u);
-}
