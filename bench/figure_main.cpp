@@ -1,6 +1,7 @@
 // The main() of every benchmark program: runs the benchmarks as usual, then prints one figure per
-// benchmark as "NAME VALUE UNIT". A benchmark named "dispatch_ns" reports nanoseconds, one
-// named "..._us" microseconds; any other reports in its own time unit.
+// benchmark as "NAME VALUE UNIT". A benchmark that sets a counter of its own name reports that
+// counter ("..._factor" and "..._speedup" in x, "..._frames" in frames, other names bare); one
+// named "..._ns" reports nanoseconds, "..._us" microseconds; any other its own time unit.
 #include <benchmark/benchmark.h>
 
 #include <QCoreApplication>
@@ -18,6 +19,17 @@ struct Figure {
     std::string unit;
 };
 
+bool EndsWith(const std::string& name, const std::string& suffix) {
+    return name.size() > suffix.size() &&
+           name.compare(name.size() - suffix.size(), suffix.size(), suffix) == 0;
+}
+
+std::string CounterUnit(const std::string& name) {
+    if (EndsWith(name, "_factor") || EndsWith(name, "_speedup")) return "x";
+    if (EndsWith(name, "_frames")) return "frames";
+    return "count";
+}
+
 class FigureReporter : public benchmark::ConsoleReporter {
   public:
     void ReportRuns(const std::vector<Run>& runs) override {
@@ -25,6 +37,10 @@ class FigureReporter : public benchmark::ConsoleReporter {
         for (const Run& run : runs) {
             if (run.error_occurred || run.run_type != Run::RT_Iteration) continue;
             const std::string name = run.benchmark_name();
+            if (const auto counter = run.counters.find(name); counter != run.counters.end()) {
+                figures_.push_back({name, counter->second.value, CounterUnit(name)});
+                continue;
+            }
             std::string unit = benchmark::GetTimeUnitString(run.time_unit);
             double value = run.GetAdjustedRealTime();
             if (name.size() > 3 && name.compare(name.size() - 3, 3, "_ns") == 0) {
