@@ -214,8 +214,9 @@ bool WaveMixer::RenderSound(Sound& sound, double step, bool looping, float targe
         }
         float envelope = 1.0f;
         if (sound.fadeIn > 0) {
-            envelope = 1.0f - static_cast<float>(sound.fadeIn) * fadeInStep;
+            // The very first frame already carries sound, so a pad answers without delay.
             --sound.fadeIn;
+            envelope = 1.0f - static_cast<float>(sound.fadeIn) * fadeInStep;
         }
         if (fadingOut) {
             if (sound.fadeOut <= 0) break;
