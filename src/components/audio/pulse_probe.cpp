@@ -1,7 +1,6 @@
 #include "components/audio/pulse_probe.h"
 
 #include <QByteArray>
-#include <QFile>
 #include <QList>
 
 #include <sys/socket.h>
