@@ -32,11 +32,14 @@ std::string CounterUnit(const std::string& name) {
 
 class FigureReporter : public benchmark::ConsoleReporter {
   public:
+    // Tables without colour codes, so the figures can be read by scripts.
+    FigureReporter() : ConsoleReporter(OO_Tabular) {}
     void ReportRuns(const std::vector<Run>& runs) override {
         ConsoleReporter::ReportRuns(runs);
         for (const Run& run : runs) {
             if (run.error_occurred || run.run_type != Run::RT_Iteration) continue;
-            const std::string name = run.benchmark_name();
+            // The bare function name: no "/iterations:3" and the like.
+            const std::string name = run.run_name.function_name;
             if (const auto counter = run.counters.find(name); counter != run.counters.end()) {
                 figures_.push_back({name, counter->second.value, CounterUnit(name)});
                 continue;

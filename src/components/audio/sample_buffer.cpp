@@ -28,24 +28,39 @@ LoadedSamples LoadSampleFile(const QString& path) {
     buffer->path = path;
     buffer->sampleRate = info.samplerate;
     buffer->channels = std::min(info.channels, 2);
-    // MP3 and some Ogg files do not know their length up front: read in blocks until the end.
+    // Mono and stereo files are read straight into place. Files with more channels keep their
+    // first two. MP3 and some Ogg files do not know their length up front, so reading goes on in
+    // blocks until the end whatever the header said.
+    const int fileChannels = info.channels;
+    const int keep = buffer->channels;
     constexpr sf_count_t kBlockFrames = 65536;
-    std::vector<float> block(static_cast<std::size_t>(kBlockFrames) * info.channels);
-    if (info.frames > 0 && info.frames < (sf_count_t{1} << 31)) {
-        buffer->samples.reserve(static_cast<std::size_t>(info.frames) * buffer->channels);
-    }
+    std::vector<float> block;
+    if (fileChannels != keep) block.resize(static_cast<std::size_t>(kBlockFrames) * fileChannels);
+    sf_count_t framesRead = 0;
     for (;;) {
-        const sf_count_t read = sf_readf_float(file.get(), block.data(), kBlockFrames);
-        if (read <= 0) break;
-        for (sf_count_t frame = 0; frame < read; ++frame) {
-            const float* in = &block[static_cast<std::size_t>(frame * info.channels)];
-            buffer->samples.push_back(in[0]);
-            if (buffer->channels == 2) buffer->samples.push_back(in[1]);
+        const sf_count_t expected = std::max<sf_count_t>(info.frames - framesRead, 0);
+        const sf_count_t want = expected > 0 ? std::min(expected, kBlockFrames * 16) : kBlockFrames;
+        buffer->samples.resize(static_cast<std::size_t>((framesRead + want) * keep));
+        float* target = buffer->samples.data() + framesRead * keep;
+        sf_count_t read = 0;
+        if (fileChannels == keep) {
+            read = sf_readf_float(file.get(), target, want);
+        } else {
+            read = sf_readf_float(file.get(), block.data(), std::min(want, kBlockFrames));
+            for (sf_count_t frame = 0; frame < read; ++frame) {
+                target[frame * keep] = block[static_cast<std::size_t>(frame * fileChannels)];
+                target[frame * keep + 1] =
+                    block[static_cast<std::size_t>(frame * fileChannels + 1)];
+            }
         }
+        if (read <= 0) break;
+        framesRead += read;
     }
+    buffer->samples.resize(static_cast<std::size_t>(framesRead * keep));
+    buffer->samples.shrink_to_fit();
     if (sf_error(file.get()) != SF_ERR_NO_ERROR) {
         return {nullptr, QString::fromLocal8Bit(sf_strerror(file.get()))};
     }
-    buffer->frames = static_cast<std::int64_t>(buffer->samples.size()) / buffer->channels;
+    buffer->frames = framesRead;
     return {std::move(buffer), QString()};
 }

@@ -4,6 +4,10 @@
 #include <cmath>
 #include <cstring>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 namespace {
 
 // Four-point, third-order Hermite interpolation between b and c at t in 0..1.
@@ -121,7 +125,7 @@ void WaveMixer::ApplyCommand(const Command& command) noexcept {
         Sound& sound = state.current;
         sound.buffer = command.buffer;
         sound.startId = command.startId;
-        sound.position = 0.0;
+        sound.position = 0;
         sound.fadeIn = fadeInFrames_;
         const Controls& controls = controls_[command.voice];
         sound.gainLeft = controls.gainLeft.load(std::memory_order_relaxed);
@@ -139,6 +143,11 @@ void WaveMixer::render(float* stereo, int frames) noexcept {
     for (int voice = 0; voice < kVoices; ++voice) RenderVoice(voice, stereo, frames);
 }
 
+std::uint64_t WaveMixer::Step(const Sound& sound, int rate) const noexcept {
+    const int playRate = rate > 0 ? rate : sound.buffer->sampleRate;
+    return static_cast<std::uint64_t>(std::llround(std::ldexp(double(playRate) / deviceRate_, 32)));
+}
+
 void WaveMixer::RenderVoice(int voice, float* stereo, int frames) noexcept {
     VoiceState& state = voices_[voice];
     const Controls& controls = controls_[voice];
@@ -149,16 +158,13 @@ void WaveMixer::RenderVoice(int voice, float* stereo, int frames) noexcept {
     float peakL = 0.0f, peakR = 0.0f;
 
     if (state.tail.buffer) {
-        const double step = (rate > 0 ? rate : state.tail.buffer->sampleRate) / double(deviceRate_);
-        const bool more = RenderSound(state.tail, step, looping, targetLeft, targetRight, true,
-                                      stereo, frames, peakL, peakR);
+        const bool more = RenderSound(state.tail, Step(state.tail, rate), looping, targetLeft,
+                                      targetRight, true, stereo, frames, peakL, peakR);
         if (!more || state.tail.fadeOut <= 0) Release(voice, state.tail);
     }
     if (state.current.buffer) {
-        const double step =
-            (rate > 0 ? rate : state.current.buffer->sampleRate) / double(deviceRate_);
-        if (!RenderSound(state.current, step, looping, targetLeft, targetRight, false, stereo,
-                         frames, peakL, peakR)) {
+        if (!RenderSound(state.current, Step(state.current, rate), looping, targetLeft, targetRight,
+                         false, stereo, frames, peakL, peakR)) {
             Report(Event{Event::Ended, static_cast<std::uint8_t>(voice), state.current.startId,
                          state.current.buffer});
             Release(voice, state.current);
@@ -168,11 +174,93 @@ void WaveMixer::RenderVoice(int voice, float* stereo, int frames) noexcept {
     peaks_[voice].right.store(peakR, std::memory_order_relaxed);
 }
 
-bool WaveMixer::RenderSound(Sound& sound, double step, bool looping, float targetLeft,
+namespace {
+
+constexpr std::uint64_t kOne = std::uint64_t{1} << 32;
+constexpr float kFraction = 1.0f / 4294967296.0f;
+
+#if defined(__SSE2__)
+// The stereo inner loop with left and right side by side in one vector: the same Hermite
+// polynomial as below, half the instructions.
+void RenderPlainStereo(const float* data, std::uint64_t& position, std::uint64_t step, int frames,
+                       float& gainL, float& gainR, float leftStep, float rightStep, float* out,
+                       float& peakL, float& peakR) noexcept {
+    const __m128 half = _mm_set1_ps(0.5f), oneAndHalf = _mm_set1_ps(1.5f);
+    const __m128 two = _mm_set1_ps(2.0f), twoAndHalf = _mm_set1_ps(2.5f);
+    const __m128 signMask = _mm_castsi128_ps(_mm_set1_epi32(0x7fffffff));
+    const __m128 gainStep = _mm_setr_ps(leftStep, rightStep, 0.0f, 0.0f);
+    __m128 gain = _mm_setr_ps(gainL, gainR, 0.0f, 0.0f);
+    __m128 peak = _mm_setr_ps(peakL, peakR, 0.0f, 0.0f);
+    for (int i = 0; i < frames; ++i) {
+        const std::uint64_t index = position >> 32;
+        const __m128 t = _mm_set1_ps(static_cast<float>(position & (kOne - 1)) * kFraction);
+        const float* p = data + (index - 1) * 2;
+        const __m128 a = _mm_loadu_ps(p);      // a in lanes 0 and 1, b in 2 and 3
+        const __m128 c = _mm_loadu_ps(p + 4);  // c, then d
+        const __m128 b = _mm_movehl_ps(a, a);
+        const __m128 d = _mm_movehl_ps(c, c);
+        const __m128 c1 = _mm_mul_ps(half, _mm_sub_ps(c, a));
+        const __m128 c2 =
+            _mm_sub_ps(_mm_add_ps(_mm_sub_ps(a, _mm_mul_ps(twoAndHalf, b)), _mm_mul_ps(two, c)),
+                       _mm_mul_ps(half, d));
+        const __m128 c3 = _mm_add_ps(_mm_mul_ps(half, _mm_sub_ps(d, a)),
+                                     _mm_mul_ps(oneAndHalf, _mm_sub_ps(b, c)));
+        const __m128 value = _mm_add_ps(
+            _mm_mul_ps(_mm_add_ps(_mm_mul_ps(_mm_add_ps(_mm_mul_ps(c3, t), c2), t), c1), t), b);
+        gain = _mm_add_ps(gain, gainStep);
+        const __m128 sample = _mm_mul_ps(value, gain);
+        float* o = out + 2 * i;
+        _mm_storel_pi(
+            reinterpret_cast<__m64*>(o),
+            _mm_add_ps(_mm_loadl_pi(_mm_setzero_ps(), reinterpret_cast<const __m64*>(o)), sample));
+        peak = _mm_max_ps(peak, _mm_and_ps(sample, signMask));
+        position += step;
+    }
+    alignas(16) float lanes[4];
+    _mm_store_ps(lanes, gain);
+    gainL = lanes[0];
+    gainR = lanes[1];
+    _mm_store_ps(lanes, peak);
+    peakL = lanes[0];
+    peakR = lanes[1];
+}
+#endif
+
+// The inner loop where nothing needs checking: all four points inside the sound, no fade.
+template <int Channels>
+void RenderPlain(const float* data, std::uint64_t& position, std::uint64_t step, int frames,
+                 float& gainL, float& gainR, float leftStep, float rightStep, float* out,
+                 float& peakL, float& peakR) noexcept {
+    for (int i = 0; i < frames; ++i) {
+        const std::uint64_t index = position >> 32;
+        const float t = static_cast<float>(position & (kOne - 1)) * kFraction;
+        const float* p = data + (index - 1) * Channels;
+        const float left = Hermite(p[0], p[Channels], p[2 * Channels], p[3 * Channels], t);
+        const float right = Channels == 2 ? Hermite(p[1], p[Channels + 1], p[2 * Channels + 1],
+                                                    p[3 * Channels + 1], t)
+                                          : left;
+        gainL += leftStep;
+        gainR += rightStep;
+        const float outL = left * gainL;
+        const float outR = right * gainR;
+        out[2 * i] += outL;
+        out[2 * i + 1] += outR;
+        peakL = std::max(peakL, std::fabs(outL));
+        peakR = std::max(peakR, std::fabs(outR));
+        position += step;
+    }
+}
+
+}  // namespace
+
+bool WaveMixer::RenderSound(Sound& sound, std::uint64_t step, bool looping, float targetLeft,
                             float targetRight, bool fadingOut, float* stereo, int frames,
                             float& peakL, float& peakR) noexcept {
     const SampleBuffer& buffer = *sound.buffer;
     const std::int64_t length = buffer.frames;
+    const std::uint64_t end = static_cast<std::uint64_t>(length) << 32;
+    // The last position from which the four interpolation points all lie inside the sound.
+    const std::uint64_t plainEnd = length >= 3 ? static_cast<std::uint64_t>(length - 2) << 32 : 0;
     const bool stereoFile = buffer.channels == 2;
     const float* data = buffer.samples.data();
     // Volume and pan glide to their new values over the period instead of jumping.
@@ -180,38 +268,49 @@ bool WaveMixer::RenderSound(Sound& sound, double step, bool looping, float targe
     const float rightStep = (targetRight - sound.gainRight) / static_cast<float>(frames);
     const float fadeInStep = 1.0f / static_cast<float>(fadeInFrames_);
     const float fadeOutStep = 1.0f / static_cast<float>(fadeOutFrames_);
-    double position = sound.position;
+    std::uint64_t position = sound.position;
     float gainL = sound.gainLeft, gainR = sound.gainRight;
     bool sounding = true;
 
-    for (int i = 0; i < frames; ++i) {
-        if (position >= static_cast<double>(length)) {
+    for (int i = 0; i < frames;) {
+        if (position >= end) {
             if (!looping || length == 0) {
                 sounding = false;
                 break;
             }
-            position -=
-                static_cast<double>(length) * std::floor(position / static_cast<double>(length));
+            position %= end;
         }
-        const auto index = static_cast<std::int64_t>(position);
-        const auto t = static_cast<float>(position - static_cast<double>(index));
-        float left, right;
-        if (index >= 1 && index + 2 < length) {  // the common case: all four points inside
-            const float* p = data + (index - 1) * buffer.channels;
-            const int c = buffer.channels;
-            left = Hermite(p[0], p[c], p[2 * c], p[3 * c], t);
-            right = stereoFile ? Hermite(p[1], p[c + 1], p[2 * c + 1], p[3 * c + 1], t) : left;
-        } else {
-            left = Hermite(SampleAt(buffer, index - 1, 0, looping),
-                           SampleAt(buffer, index, 0, looping),
-                           SampleAt(buffer, index + 1, 0, looping),
-                           SampleAt(buffer, index + 2, 0, looping), t);
-            right = stereoFile ? Hermite(SampleAt(buffer, index - 1, 1, looping),
-                                         SampleAt(buffer, index, 1, looping),
-                                         SampleAt(buffer, index + 1, 1, looping),
-                                         SampleAt(buffer, index + 2, 1, looping), t)
-                               : left;
+        const bool fading = sound.fadeIn > 0 || fadingOut;
+        if (!fading && position >= kOne && position < plainEnd) {
+            const std::uint64_t run = (plainEnd - position + step - 1) / step;
+            const int count = static_cast<int>(std::min<std::uint64_t>(run, frames - i));
+            if (stereoFile) {
+#if defined(__SSE2__)
+                RenderPlainStereo(
+#else
+                RenderPlain<2>(
+#endif
+                    data, position, step, count, gainL, gainR, leftStep, rightStep, stereo + 2 * i,
+                    peakL, peakR);
+            } else {
+                RenderPlain<1>(data, position, step, count, gainL, gainR, leftStep, rightStep,
+                               stereo + 2 * i, peakL, peakR);
+            }
+            i += count;
+            continue;
         }
+
+        // One frame the careful way: at the edges of the sound, across a loop, or fading.
+        const auto index = static_cast<std::int64_t>(position >> 32);
+        const float t = static_cast<float>(position & (kOne - 1)) * kFraction;
+        const float left = Hermite(
+            SampleAt(buffer, index - 1, 0, looping), SampleAt(buffer, index, 0, looping),
+            SampleAt(buffer, index + 1, 0, looping), SampleAt(buffer, index + 2, 0, looping), t);
+        const float right = stereoFile ? Hermite(SampleAt(buffer, index - 1, 1, looping),
+                                                 SampleAt(buffer, index, 1, looping),
+                                                 SampleAt(buffer, index + 1, 1, looping),
+                                                 SampleAt(buffer, index + 2, 1, looping), t)
+                                       : left;
         float envelope = 1.0f;
         if (sound.fadeIn > 0) {
             // The very first frame already carries sound, so a pad answers without delay.
@@ -232,6 +331,7 @@ bool WaveMixer::RenderSound(Sound& sound, double step, bool looping, float targe
         peakL = std::max(peakL, std::fabs(outL));
         peakR = std::max(peakR, std::fabs(outR));
         position += step;
+        ++i;
     }
     sound.position = position;
     sound.gainLeft = targetLeft;

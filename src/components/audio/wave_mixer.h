@@ -79,7 +79,7 @@ class WaveMixer : public AudioRenderer {
     // A sound being played: the voice's current one, or the tail of the previous one fading out.
     struct Sound {
         const SampleBuffer* buffer = nullptr;
-        double position = 0.0;
+        std::uint64_t position = 0;  // frames, 32.32 fixed point
         std::uint32_t startId = 0;
         int fadeIn = 0;   // frames of fade-in still to go
         int fadeOut = 0;  // frames of fade-out still to go (tails only)
@@ -94,9 +94,11 @@ class WaveMixer : public AudioRenderer {
     void Release(int voice, Sound& sound) noexcept;
     void RenderVoice(int voice, float* stereo, int frames) noexcept;
     // Adds the sound into the mix; false when a non-looped sound reached its end.
-    bool RenderSound(Sound& sound, double step, bool looping, float targetLeft, float targetRight,
-                     bool fadingOut, float* stereo, int frames, float& peakL,
+    bool RenderSound(Sound& sound, std::uint64_t step, bool looping, float targetLeft,
+                     float targetRight, bool fadingOut, float* stereo, int frames, float& peakL,
                      float& peakR) noexcept;
+    // How far one device frame moves through the sound, 32.32 fixed point.
+    std::uint64_t Step(const Sound& sound, int rate) const noexcept;
     void Report(const Event& event) noexcept;
 
     int deviceRate_;
