@@ -6,6 +6,10 @@
 
 #include <QSignalSpy>
 
+#include "support/wave_files.h"
+
+#include <QTemporaryDir>
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -74,8 +78,18 @@ TEST(AudioEngine, PlaysThroughTheInjectedDeviceAtItsRateAndForgetsSoundsOnStop) 
 
     engine.mixer().start(3, ConstantSound(0.5f, 44100, 44100));
     EXPECT_NEAR(Loudest(device.pull(4)), 0.5f, 1e-3f);
+    QTemporaryDir dir;
+    const QString pad = dir.filePath("pad.wav");
+    ASSERT_TRUE(WriteTestWave(pad, 44100, 1, 44100, [](long, int) { return 0.25f; }));
+    ASSERT_TRUE(engine.channels().channel(60).setFileName(pad));
+    ASSERT_TRUE(engine.channels().channel(60).start());
+    QSignalSpy ended(&engine.channels(), &WaveChannels::playbackEnded);
 
     engine.stop();
+    // Sounds cut off by the stop have ended, and the pads hear of it.
+    EXPECT_FALSE(engine.channels().channel(60).isPlaying());
+    ASSERT_EQ(ended.count(), 1);
+    EXPECT_EQ(ended[0][0].toInt(), 60);
     EXPECT_FALSE(device.isRunning());
     EXPECT_FALSE(engine.isRunning());
     EXPECT_TRUE(engine.outputDescription().isEmpty());

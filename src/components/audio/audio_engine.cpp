@@ -53,6 +53,7 @@ void AudioEngine::stop() {
     output_ = nullptr;
     openedOutput_.reset();
     mixer_.resetWhileStopped();
+    channels_.soundsCutOff();
 }
 
 bool AudioEngine::restart() {

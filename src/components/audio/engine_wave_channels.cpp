@@ -81,12 +81,20 @@ MixerWaveChannel& EngineWaveChannels::channel(int padNote) {
 }
 
 void EngineWaveChannels::collectEvents() {
-    mixer_.collectEvents([this](int voice) {
-        channels_[voice]->playbackEnded();
-        if (voice == WaveMixer::kPlayerVoice) {
-            emit playerEnded();
-        } else {
-            emit playbackEnded(kFirstPad + voice);
-        }
-    });
+    mixer_.collectEvents([this](int voice) { Ended(voice); });
+}
+
+void EngineWaveChannels::soundsCutOff() {
+    for (int voice = 0; voice < WaveMixer::kVoices; ++voice) {
+        if (channels_[voice]->isPlaying()) Ended(voice);
+    }
+}
+
+void EngineWaveChannels::Ended(int voice) {
+    channels_[voice]->playbackEnded();
+    if (voice == WaveMixer::kPlayerVoice) {
+        emit playerEnded();
+    } else {
+        emit playbackEnded(kFirstPad + voice);
+    }
 }

@@ -59,11 +59,16 @@ class EngineWaveChannels : public WaveChannels {
 
     // Delivers ended sounds and frees buffers the audio thread let go; the timer calls it.
     void collectEvents();
+    // The device stopped and the mixer forgot its sounds: every channel that was playing has
+    // ended, and says so.
+    void soundsCutOff();
 
   signals:
     void playerEnded();
 
   private:
+    void Ended(int voice);
+
     WaveMixer& mixer_;
     SampleCache cache_;
     std::array<std::unique_ptr<MixerWaveChannel>, WaveMixer::kVoices> channels_;
