@@ -23,8 +23,7 @@ void CopyOut(const float* ring, std::size_t capacity, std::size_t at, float* to,
 
 }  // namespace
 
-SampleRing::SampleRing(std::size_t capacity)
-    : capacity_(capacity), samples_(new float[capacity]) {
+SampleRing::SampleRing(std::size_t capacity) : capacity_(capacity), samples_(new float[capacity]) {
     assert(capacity >= 2 && (capacity & (capacity - 1)) == 0);
     std::fill_n(samples_.get(), capacity_, 0.0f);
 }
