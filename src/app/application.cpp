@@ -1,7 +1,7 @@
 #include "app/application.h"
 
 #include "app/main_window.h"
-#include "components/audio/recording_wave_channels.h"
+#include "components/audio/audio_engine.h"
 #include "components/midi/rtmidi_input_port.h"
 #include "components/midi/rtmidi_output_port.h"
 #include "components/prompts/qt_prompts.h"
@@ -14,12 +14,16 @@
 #include "midi/startup_device_check.h"
 #include "pickers/gm_names.h"
 
+Backends::Backends() = default;
+Backends::Backends(Backends&&) noexcept = default;
+Backends& Backends::operator=(Backends&&) noexcept = default;
+Backends::~Backends() = default;
+
 Backends Backends::Real() {
     Backends backends;
     backends.settings = std::make_unique<QSettingsStore>();
     backends.prompts = std::make_unique<QtPrompts>();
-    // Silent channels until the audio engine drives the pads.
-    backends.channels = std::make_unique<RecordingWaveChannels>();
+    backends.audio = std::make_unique<AudioEngine>(*backends.settings);
     backends.midiIn = std::make_unique<RtMidiInputPort>();
     backends.midiOut = std::make_unique<RtMidiOutputPort>();
     backends.instrumentList = GmNames::InstalledListFile(QStringLiteral("genmidi.txt"));
@@ -27,11 +31,15 @@ Backends Backends::Real() {
     return backends;
 }
 
+WaveChannels& Backends::padChannels() {
+    return audio ? static_cast<WaveChannels&>(audio->channels()) : *channels;
+}
+
 Application::Application(Backends backends, QObject* parent)
     : QObject(parent), backends_(std::move(backends)) {
     names_ =
         std::make_unique<GmNames>(backends_.instrumentList, backends_.drumList, *backends_.prompts);
-    waves_ = std::make_unique<WavePlayback>(context_, *backends_.channels, *backends_.prompts);
+    waves_ = std::make_unique<WavePlayback>(context_, backends_.padChannels(), *backends_.prompts);
     dispatcher_ = std::make_unique<InputDispatcher>(context_, *backends_.midiOut, *waves_);
     window_ = std::make_unique<MainWindow>();
     if (auto* qtPrompts = dynamic_cast<QtPrompts*>(backends_.prompts.get())) {
@@ -57,8 +65,14 @@ Application::~Application() {
 }
 
 void Application::Start() {
+    if (backends_.audio) {
+        connect(backends_.audio.get(), &AudioEngine::statusNotice, window_.get(),
+                &MainWindow::ShowStatus);
+        // Sound first: the table reset below releases the pads' channels.
+        backends_.audio->start();
+    }
     GetStartupDefaults(context_, *backends_.settings);
-    InitializeAllMidiNotes(context_, *names_, *backends_.channels);
+    InitializeAllMidiNotes(context_, *names_, backends_.padChannels());
     context_.GlobalTranspose = 0;
     context_.CurrentFileName.clear();
     // The MIDI setup dialog joins here when it exists; until then the question alone is asked.
@@ -69,7 +83,9 @@ void Application::Start() {
 void Application::Shutdown() {
     if (shutDown_) return;
     shutDown_ = true;
-    for (int note = kFirstPad; note <= kLastPad; ++note) backends_.channels->channel(note).close();
+    for (int note = kFirstPad; note <= kLastPad; ++note)
+        backends_.padChannels().channel(note).close();
+    if (backends_.audio) backends_.audio->stop();
     midiSetup_->CloseMidiInPort();
     midiSetup_->CloseMidiOutPort();
 }

@@ -10,6 +10,7 @@
 
 #include <memory>
 
+class AudioEngine;
 class ComputerKeyboard;
 class GmNames;
 class InputDispatcher;
@@ -22,14 +23,24 @@ class WavePlayback;
 struct Backends {
     std::unique_ptr<SettingsStore> settings;
     std::unique_ptr<Prompts> prompts;
+    // The sound engine; without one (tests) the pads play on `channels`.
+    std::unique_ptr<AudioEngine> audio;
     std::unique_ptr<WaveChannels> channels;
     std::unique_ptr<MidiInputPort> midiIn;
     std::unique_ptr<MidiOutputPort> midiOut;
     QString instrumentList;
     QString drumList;
 
-    // RtMidi ports, the user's settings, Qt's message boxes and the installed name lists.
+    // The audio engine, RtMidi ports, the user's settings, Qt's message boxes and the installed
+    // name lists.
     static Backends Real();
+    // Out of line: the members' types are only declared here.
+    Backends();
+    Backends(Backends&&) noexcept;
+    Backends& operator=(Backends&&) noexcept;
+    ~Backends();
+
+    WaveChannels& padChannels();
 };
 
 // Builds every part of the program around one Context, runs start-up in its fixed order and
@@ -40,9 +51,10 @@ class Application : public QObject {
     explicit Application(Backends backends, QObject* parent = nullptr);
     ~Application() override;
 
-    // Settings defaults, the table reset, the MIDI device check; then the window is shown.
+    // The audio engine, the settings defaults, the table reset, the MIDI device check; then the
+    // window is shown.
     void Start();
-    // Silences and releases the pads' channels and closes both MIDI ports.
+    // Releases the pads' channels, stops the audio engine and closes both MIDI ports.
     void Shutdown();
 
     Context& context() { return context_; }

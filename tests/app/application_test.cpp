@@ -1,12 +1,16 @@
 #include "app/application.h"
 #include "app/main_window.h"
+#include "components/audio/audio_engine.h"
+#include "components/audio/offline_audio_device.h"
 #include "components/audio/recording_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "components/settings/memory_settings_store.h"
+#include "support/wave_files.h"
 
 #include <QLineEdit>
 #include <QSignalSpy>
+#include <QTemporaryDir>
 #include <QTest>
 #include <QVBoxLayout>
 
@@ -23,9 +27,11 @@ struct ProgramTest : ::testing::Test {
     LoopbackMidiOutput* midiOut =
         new LoopbackMidiOutput({QStringLiteral("Synth"), QStringLiteral("Drums")});
     std::unique_ptr<Application> program;
+    std::unique_ptr<AudioEngine> audio;  // when set, the pads play through it
 
     void Build() {
         Backends backends;
+        backends.audio = std::move(audio);
         backends.settings.reset(settings);
         backends.prompts.reset(prompts);
         backends.channels.reset(channels);
@@ -121,4 +127,35 @@ TEST_F(ProgramTest, ClosingTheWindowReleasesChannelsAndClosesBothPorts) {
     EXPECT_EQ(channels->log.first(), "57 close");
     program.reset();  // a second shutdown from the destructor does nothing more
     EXPECT_EQ(channels->log.size(), 16);
+}
+
+TEST_F(ProgramTest, AKeyOnTheMidiKeyboardPlaysAWavePadThroughTheAudioEngine) {
+    auto owned = std::make_unique<OfflineAudioDevice>(AudioStreamFormat{48000, 256, 2});
+    OfflineAudioDevice& device = *owned;
+    audio = std::make_unique<AudioEngine>(std::move(owned));
+    StoreDevices(0, 0);
+    Build();
+    program->Start();
+    ASSERT_TRUE(device.isRunning());
+
+    QTemporaryDir dir;
+    const QString hit = dir.filePath("hit.wav");
+    ASSERT_TRUE(WriteTestWave(hit, 48000, 1, 4800, [](long, int) { return 0.5f; }));
+    NoteSlot& slot = program->context().NoteSlots[64];
+    slot.NoteFunction = "1";
+    slot.WaveFileName = hit;
+    slot.WaveAssigned = "True";
+
+    midiIn->inject({144, 64, 100});
+    ASSERT_TRUE(QTest::qWaitFor([&] { return slot.WavePlaying == "True"; }, 5000));
+    const std::vector<float>& period = device.pull();
+    EXPECT_GT(period[0], 0.0f) << "heard in the very next period";
+    EXPECT_FLOAT_EQ(period[200], 0.5f);
+
+    // The 0.1 s sound ends by itself and the pad hears of it.
+    device.pull(20);
+    ASSERT_TRUE(QTest::qWaitFor([&] { return slot.WavePlaying == "False"; }, 5000));
+
+    program->window().close();
+    EXPECT_FALSE(device.isRunning()) << "shutdown stops the engine";
 }
