@@ -8,6 +8,7 @@
 
 #include <unistd.h>
 #include <csignal>
+#include <optional>
 
 namespace {
 
@@ -25,11 +26,13 @@ void RecordAndDie(const QString& path) {
 
 TEST(WaveRecorderCrash, AKilledRecordingLeavesAllButTheLastSecond) {
     // The child runs this test again from the start in a fresh process; it finds the parent's
-    // file name in the environment.
+    // file name in the environment and makes no folder of its own, which it could not remove.
     GTEST_FLAG_SET(death_test_style, "threadsafe");
-    QTemporaryDir folder;
-    if (qEnvironmentVariableIsEmpty(kTakeVariable))
-        qputenv(kTakeVariable, folder.filePath(QStringLiteral("default0.wav")).toLocal8Bit());
+    std::optional<QTemporaryDir> folder;
+    if (qEnvironmentVariableIsEmpty(kTakeVariable)) {
+        folder.emplace();
+        qputenv(kTakeVariable, folder->filePath(QStringLiteral("default0.wav")).toLocal8Bit());
+    }
     const QString path = qEnvironmentVariable(kTakeVariable);
 
     EXPECT_EXIT(RecordAndDie(path), ::testing::KilledBySignal(SIGKILL), "");
