@@ -10,12 +10,15 @@
 
 namespace {
 
-// Four-point, third-order Hermite interpolation between b and c at t in 0..1.
+// Four-point, third-order Hermite interpolation between b and c at t in 0..1, in the form that
+// needs the fewest operations.
 inline float Hermite(float a, float b, float c, float d, float t) {
-    const float c1 = 0.5f * (c - a);
-    const float c2 = a - 2.5f * b + 2.0f * c - 0.5f * d;
-    const float c3 = 0.5f * (d - a) + 1.5f * (b - c);
-    return ((c3 * t + c2) * t + c1) * t + b;
+    const float slope = 0.5f * (c - a);
+    const float v = b - c;
+    const float w = slope + v;
+    const float cubic = w + v + 0.5f * (d - b);
+    const float square = w + cubic;
+    return ((cubic * t - square) * t + slope) * t + b;
 }
 
 // One channel's sample at a frame index that may lie outside the sound: looped sounds wrap,
@@ -177,52 +180,78 @@ void WaveMixer::RenderVoice(int voice, float* stereo, int frames) noexcept {
 namespace {
 
 constexpr std::uint64_t kOne = std::uint64_t{1} << 32;
-constexpr float kFraction = 1.0f / 4294967296.0f;
+// The fraction between two frames, from the top 24 bits below the point: exact in a float and a
+// signed conversion, which is one instruction where an unsigned 64-bit one is several.
+inline float Fraction(std::uint64_t position) {
+    return static_cast<float>(static_cast<std::int32_t>((position >> 8) & 0xFFFFFF)) *
+           (1.0f / 16777216.0f);
+}
 
 #if defined(__SSE2__)
-// The stereo inner loop with left and right side by side in one vector: the same Hermite
-// polynomial as below, half the instructions.
+// Hermite interpolation of four lanes at once: the same operations as Hermite() above.
+inline __m128 Hermite4(__m128 a, __m128 b, __m128 c, __m128 d, __m128 t) {
+    const __m128 half = _mm_set1_ps(0.5f);
+    const __m128 slope = _mm_mul_ps(half, _mm_sub_ps(c, a));
+    const __m128 v = _mm_sub_ps(b, c);
+    const __m128 w = _mm_add_ps(slope, v);
+    const __m128 cubic = _mm_add_ps(_mm_add_ps(w, v), _mm_mul_ps(half, _mm_sub_ps(d, b)));
+    const __m128 square = _mm_add_ps(w, cubic);
+    return _mm_add_ps(
+        _mm_mul_ps(_mm_add_ps(_mm_mul_ps(_mm_sub_ps(_mm_mul_ps(cubic, t), square), t), slope), t),
+        b);
+}
+
+// The stereo inner loop, two frames at a time: left and right of both frames side by side in
+// one vector.
 void RenderPlainStereo(const float* data, std::uint64_t& position, std::uint64_t step, int frames,
                        float& gainL, float& gainR, float leftStep, float rightStep, float* out,
                        float& peakL, float& peakR) noexcept {
-    const __m128 half = _mm_set1_ps(0.5f), oneAndHalf = _mm_set1_ps(1.5f);
-    const __m128 two = _mm_set1_ps(2.0f), twoAndHalf = _mm_set1_ps(2.5f);
     const __m128 signMask = _mm_castsi128_ps(_mm_set1_epi32(0x7fffffff));
-    const __m128 gainStep = _mm_setr_ps(leftStep, rightStep, 0.0f, 0.0f);
-    __m128 gain = _mm_setr_ps(gainL, gainR, 0.0f, 0.0f);
-    __m128 peak = _mm_setr_ps(peakL, peakR, 0.0f, 0.0f);
-    for (int i = 0; i < frames; ++i) {
-        const std::uint64_t index = position >> 32;
-        const __m128 t = _mm_set1_ps(static_cast<float>(position & (kOne - 1)) * kFraction);
-        const float* p = data + (index - 1) * 2;
-        const __m128 a = _mm_loadu_ps(p);      // a in lanes 0 and 1, b in 2 and 3
-        const __m128 c = _mm_loadu_ps(p + 4);  // c, then d
-        const __m128 b = _mm_movehl_ps(a, a);
-        const __m128 d = _mm_movehl_ps(c, c);
-        const __m128 c1 = _mm_mul_ps(half, _mm_sub_ps(c, a));
-        const __m128 c2 =
-            _mm_sub_ps(_mm_add_ps(_mm_sub_ps(a, _mm_mul_ps(twoAndHalf, b)), _mm_mul_ps(two, c)),
-                       _mm_mul_ps(half, d));
-        const __m128 c3 = _mm_add_ps(_mm_mul_ps(half, _mm_sub_ps(d, a)),
-                                     _mm_mul_ps(oneAndHalf, _mm_sub_ps(b, c)));
-        const __m128 value = _mm_add_ps(
-            _mm_mul_ps(_mm_add_ps(_mm_mul_ps(_mm_add_ps(_mm_mul_ps(c3, t), c2), t), c1), t), b);
-        gain = _mm_add_ps(gain, gainStep);
-        const __m128 sample = _mm_mul_ps(value, gain);
+    const __m128 gainStep = _mm_setr_ps(2 * leftStep, 2 * rightStep, 2 * leftStep, 2 * rightStep);
+    __m128 gain = _mm_setr_ps(gainL + leftStep, gainR + rightStep, gainL + 2 * leftStep,
+                              gainR + 2 * rightStep);
+    __m128 peak = _mm_setr_ps(peakL, peakR, peakL, peakR);
+    int i = 0;
+    for (; i + 1 < frames; i += 2) {
+        const std::uint64_t next = position + step;
+        // Frame k reads points a b | c d from p and p + 4; so does frame k + 1 from q.
+        const float* p = data + ((position >> 32) - 1) * 2;
+        const float* q = data + ((next >> 32) - 1) * 2;
+        const __m128 p01 = _mm_loadu_ps(p), p23 = _mm_loadu_ps(p + 4);
+        const __m128 q01 = _mm_loadu_ps(q), q23 = _mm_loadu_ps(q + 4);
+        const __m128 a = _mm_movelh_ps(p01, q01);
+        const __m128 b = _mm_movehl_ps(q01, p01);
+        const __m128 c = _mm_movelh_ps(p23, q23);
+        const __m128 d = _mm_movehl_ps(q23, p23);
+        const float tp = Fraction(position), tq = Fraction(next);
+        const __m128 t = _mm_setr_ps(tp, tp, tq, tq);
+        const __m128 sample = _mm_mul_ps(Hermite4(a, b, c, d, t), gain);
         float* o = out + 2 * i;
-        _mm_storel_pi(
-            reinterpret_cast<__m64*>(o),
-            _mm_add_ps(_mm_loadl_pi(_mm_setzero_ps(), reinterpret_cast<const __m64*>(o)), sample));
+        _mm_storeu_ps(o, _mm_add_ps(_mm_loadu_ps(o), sample));
         peak = _mm_max_ps(peak, _mm_and_ps(sample, signMask));
-        position += step;
+        gain = _mm_add_ps(gain, gainStep);
+        position = next + step;
     }
     alignas(16) float lanes[4];
-    _mm_store_ps(lanes, gain);
-    gainL = lanes[0];
-    gainR = lanes[1];
     _mm_store_ps(lanes, peak);
-    peakL = lanes[0];
-    peakR = lanes[1];
+    peakL = std::max(lanes[0], lanes[2]);
+    peakR = std::max(lanes[1], lanes[3]);
+    _mm_store_ps(lanes, gain);
+    gainL = lanes[0] - leftStep;  // the gain of the last frame rendered
+    gainR = lanes[1] - rightStep;
+    if (i < frames) {  // an odd frame left over
+        const float* p = data + ((position >> 32) - 1) * 2;
+        const float t = Fraction(position);
+        const float left = Hermite(p[0], p[2], p[4], p[6], t);
+        const float right = Hermite(p[1], p[3], p[5], p[7], t);
+        gainL += leftStep;
+        gainR += rightStep;
+        out[2 * i] += left * gainL;
+        out[2 * i + 1] += right * gainR;
+        peakL = std::max(peakL, std::fabs(left * gainL));
+        peakR = std::max(peakR, std::fabs(right * gainR));
+        position += step;
+    }
 }
 #endif
 
@@ -233,7 +262,7 @@ void RenderPlain(const float* data, std::uint64_t& position, std::uint64_t step,
                  float& peakL, float& peakR) noexcept {
     for (int i = 0; i < frames; ++i) {
         const std::uint64_t index = position >> 32;
-        const float t = static_cast<float>(position & (kOne - 1)) * kFraction;
+        const float t = Fraction(position);
         const float* p = data + (index - 1) * Channels;
         const float left = Hermite(p[0], p[Channels], p[2 * Channels], p[3 * Channels], t);
         const float right = Channels == 2 ? Hermite(p[1], p[Channels + 1], p[2 * Channels + 1],
@@ -302,7 +331,7 @@ bool WaveMixer::RenderSound(Sound& sound, std::uint64_t step, bool looping, floa
 
         // One frame the careful way: at the edges of the sound, across a loop, or fading.
         const auto index = static_cast<std::int64_t>(position >> 32);
-        const float t = static_cast<float>(position & (kOne - 1)) * kFraction;
+        const float t = Fraction(position);
         const float left = Hermite(
             SampleAt(buffer, index - 1, 0, looping), SampleAt(buffer, index, 0, looping),
             SampleAt(buffer, index + 1, 0, looping), SampleAt(buffer, index + 2, 0, looping), t);

@@ -185,3 +185,26 @@ TEST_F(MixerTest, StereoAndMonoInterpolateAlikeAtAnyRate) {
     for (long i = 0; i < 10 * 256; ++i) ASSERT_NEAR(L(fromStereo, i), L(fromMono, i), 1e-6f) << i;
     EXPECT_GT(*std::max_element(fromMono.begin(), fromMono.end()), 0.3f);
 }
+
+TEST_F(MixerTest, BetweenSamplesAStraightLineStaysStraight) {
+    // The interpolator follows any straight line exactly, on both inner loops.
+    for (int channels : {1, 2}) {
+        SCOPED_TRACE(channels);
+        const QString path = dir.filePath(QStringLiteral("ramp%1.wav").arg(channels));
+        ASSERT_TRUE(WriteTestWave(path, 44100, channels, 20000,
+                                  [](long f, int) { return static_cast<float>(f) / 20000; }));
+        MixerWaveChannel& channel =
+            channels == 1 ? this->channels.channel(67) : this->channels.channel(68);
+        ASSERT_TRUE(channel.setFileName(path));
+        channel.setFrequency(30011);
+        channel.start();
+        const std::vector<float> out = device.pull(8);
+        const double step = 30011.0 / 44100.0;
+        for (long i = 50; i < 8 * 256; ++i) {
+            ASSERT_NEAR(L(out, i), i * step / 20000, 2e-6) << i;
+            ASSERT_NEAR(R(out, i), i * step / 20000, 2e-6) << i;
+        }
+        channel.stop();
+        device.pull();
+    }
+}
