@@ -70,6 +70,7 @@ void Application::Start() {
                 &MainWindow::ShowStatus);
         // Sound first: the table reset below releases the pads' channels.
         backends_.audio->start();
+        window_->ShowDeviceSummary(backends_.audio->outputDescription());
     }
     GetStartupDefaults(context_, *backends_.settings);
     InitializeAllMidiNotes(context_, *names_, backends_.padChannels());

@@ -6,12 +6,15 @@
 #include <QApplication>
 #include <QCloseEvent>
 #include <QKeyEvent>
+#include <QLabel>
 #include <QStatusBar>
 
 MainWindow::MainWindow(QWidget* parent) : QMainWindow(parent) {
     setWindowTitle(UntitledCaption());
     resize(1100, 700);
     statusBar()->setObjectName(QStringLiteral("InfoStatusBar"));
+    deviceSummary_ = new QLabel(this);
+    statusBar()->addPermanentWidget(deviceSummary_);
     // Every key event of the application passes here first, so a focused control never keeps a
     // note key to itself. Dialogs' own text fields keep theirs (see eventFilter).
     qApp->installEventFilter(this);

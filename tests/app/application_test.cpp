@@ -137,6 +137,7 @@ TEST_F(ProgramTest, AKeyOnTheMidiKeyboardPlaysAWavePadThroughTheAudioEngine) {
     Build();
     program->Start();
     ASSERT_TRUE(device.isRunning());
+    EXPECT_EQ(program->window().DeviceSummary(), "offline");
 
     QTemporaryDir dir;
     const QString hit = dir.filePath("hit.wav");
