@@ -28,6 +28,14 @@ void MainWindow::ShowStatus(const QString& text) {
     statusBar()->showMessage(text);
 }
 
+void MainWindow::ShowDeviceSummary(const QString& text) {
+    deviceSummary_->setText(text);
+}
+
+QString MainWindow::DeviceSummary() const {
+    return deviceSummary_->text();
+}
+
 void MainWindow::ShowKey(int note, bool pressed) {
     if (!IsPad(note)) return;
     const quint32 bit = 1u << (note - kFirstPad);
