@@ -50,6 +50,17 @@ struct DispatchTest : ::testing::Test {
     int Stops(int note) const { return channels.log.count(QString::number(note) + " stop"); }
     bool Sounding(int note) { return channels.channel(note).isPlaying(); }
     const QString& Playing(int note) const { return context.NoteSlots[note].WavePlaying; }
+
+    // The note-ons ("60 on") and note-offs ("60 off") sent on channel 1, without the bank,
+    // program and pan sent before each note.
+    QStringList Notes() const {
+        QStringList notes;
+        for (const ShortMessage& m : midiOut.sent) {
+            if (m.status == 144)
+                notes << QStringLiteral("%1 %2").arg(m.data1).arg(m.data2 ? "on" : "off");
+        }
+        return notes;
+    }
 };
 
 inline std::vector<ShortMessage> Messages(std::initializer_list<ShortMessage> list) {
