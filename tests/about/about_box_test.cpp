@@ -37,14 +37,6 @@ TEST(AboutBoxTest, ShowsNameVersionAndDescription) {
     for (int i = 0; i < description.size(); ++i) {
         EXPECT_EQ(Text(box, QStringLiteral("lblDescription%1").arg(i)), description[i]);
     }
-    // Each description line sits below the one before it.
-    box.show();
-    for (int i = 1; i < description.size(); ++i) {
-        const auto* above = box.findChild<QLabel*>(QStringLiteral("lblDescription%1").arg(i - 1));
-        const auto* below = box.findChild<QLabel*>(QStringLiteral("lblDescription%1").arg(i));
-        EXPECT_GT(below->y(), above->y()) << i;
-    }
-    EXPECT_FALSE(box.findChild<QLabel*>("lblCredit0")->text().isEmpty());
     const auto* picture = box.findChild<QLabel*>("picIcon");
     ASSERT_NE(picture, nullptr);
     EXPECT_FALSE(picture->pixmap().isNull());
