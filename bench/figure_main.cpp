@@ -1,6 +1,7 @@
 // The main() of every benchmark program: runs the benchmarks as usual, then prints one figure per
 // benchmark as "NAME VALUE UNIT". A benchmark that sets a counter of its own name reports that
-// counter ("..._factor" and "..._speedup" in x, "..._frames" in frames, other names bare); one
+// counter ("..._factor" and "..._speedup" in x, "..._frames" in frames, other names bare), and
+// one that measures several things reports each counter named "..._ms" or "..._mb"; one
 // named "..._ns" reports nanoseconds, "..._us" microseconds; any other its own time unit.
 #include <benchmark/benchmark.h>
 
@@ -27,6 +28,8 @@ bool EndsWith(const std::string& name, const std::string& suffix) {
 std::string CounterUnit(const std::string& name) {
     if (EndsWith(name, "_factor") || EndsWith(name, "_speedup")) return "x";
     if (EndsWith(name, "_frames")) return "frames";
+    if (EndsWith(name, "_ms")) return "ms";
+    if (EndsWith(name, "_mb")) return "MB";
     return "count";
 }
 
@@ -44,6 +47,15 @@ class FigureReporter : public benchmark::ConsoleReporter {
                 figures_.push_back({name, counter->second.value, CounterUnit(name)});
                 continue;
             }
+            // A benchmark that measures several things names each figure by a counter.
+            bool reported = false;
+            for (const auto& [counterName, counter] : run.counters) {
+                if (EndsWith(counterName, "_ms") || EndsWith(counterName, "_mb")) {
+                    figures_.push_back({counterName, counter.value, CounterUnit(counterName)});
+                    reported = true;
+                }
+            }
+            if (reported) continue;
             std::string unit = benchmark::GetTimeUnitString(run.time_unit);
             double value = run.GetAdjustedRealTime();
             if (name.size() > 3 && name.compare(name.size() - 3, 3, "_ns") == 0) {

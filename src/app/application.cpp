@@ -1,18 +1,25 @@
 #include "app/application.h"
 
+#include "about/about_box.h"
 #include "app/main_window.h"
+#include "app/startup_trace.h"
 #include "components/audio/audio_engine.h"
 #include "components/midi/rtmidi_input_port.h"
 #include "components/midi/rtmidi_output_port.h"
 #include "components/prompts/qt_prompts.h"
 #include "components/settings/qsettings_store.h"
 #include "engine/computer_keys.h"
+#include "engine/global_midi_commands.h"
 #include "engine/input_dispatcher.h"
+#include "engine/pad_controls.h"
 #include "engine/wave_playback.h"
 #include "midi/midi_input_pump.h"
 #include "midi/midi_setup.h"
 #include "midi/startup_device_check.h"
 #include "pickers/gm_names.h"
+
+#include <QGuiApplication>
+#include <QScreen>
 
 Backends::Backends() = default;
 Backends::Backends(Backends&&) noexcept = default;
@@ -54,10 +61,22 @@ Application::Application(Backends backends, QObject* parent)
 
     ComputerKeyboard::Commands commands;
     commands.allSoundsOff = [this] { AllSoundsOff(); };
+    commands.showTransposeInfo = [this] { window_->ShowTransposeInfoBar(); };
     commands.showKey = showKey;
     keyboard_ = std::make_unique<ComputerKeyboard>(context_, *dispatcher_, commands);
-    window_->SetKeyboard(keyboard_.get());
+
+    PadControls::Display display;
+    display.showKey = showKey;
+    display.hideNoteMarker = [this] { window_->HideNoteMarker(); };
+    display.placeNoteMarker = [this](int note) { window_->PlaceNoteMarker(note); };
+    display.showStatus = showStatus;
+    pads_ = std::make_unique<PadControls>(context_, backends_.padChannels(), *dispatcher_, *names_,
+                                          display);
+    globalCommands_ = std::make_unique<GlobalMidiCommands>(context_, *names_);
+    window_->Attach(context_, *pads_, *globalCommands_, *keyboard_, backends_.padChannels());
     connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
+    connect(window_.get(), &MainWindow::allSoundsOffRequested, this, &Application::AllSoundsOff);
+    connect(window_.get(), &MainWindow::aboutRequested, this, &Application::ShowAbout);
 }
 
 Application::~Application() {
@@ -65,19 +84,37 @@ Application::~Application() {
 }
 
 void Application::Start() {
+    // The splash first; start-up goes on when it has closed itself or OK was pressed.
+    {
+        AboutBox splash(AboutBox::Mode::Splash);
+        splash.setSplashInterval(backends_.splashMilliseconds);
+        StartupTrace::instance().watchFirstPaint(&splash, "splash-shown");
+        splash.exec();
+        StartupTrace::instance().mark("splash-closed");
+    }
+    // Centred on the screen, at the size its layout asks for.
+    window_->resize(window_->sizeHint().expandedTo(QSize(1180, 720)));
+    if (const QScreen* screen = QGuiApplication::primaryScreen()) {
+        window_->move(screen->availableGeometry().center() - window_->rect().center());
+    }
     if (backends_.audio) {
         connect(backends_.audio.get(), &AudioEngine::statusNotice, window_.get(),
                 &MainWindow::ShowStatus);
-        // Sound first: the table reset below releases the pads' channels.
+        // Sound before the table: the table reset releases the pads' channels.
         backends_.audio->start();
         window_->ShowDeviceSummary(backends_.audio->outputDescription());
     }
     GetStartupDefaults(context_, *backends_.settings);
+    window_->SetAudioVolumeRange();
     InitializeAllMidiNotes(context_, *names_, backends_.padChannels());
     context_.GlobalTranspose = 0;
     context_.CurrentFileName.clear();
     // The MIDI setup dialog joins here when it exists; until then the question alone is asked.
     RunStartupMidiCheck(*midiSetup_, context_, *backends_.settings, *backends_.prompts, {});
+    window_->AlignMidiInfoLabels();
+    window_->UpdateUserControls();
+    StartupTrace::instance().watchFirstPaint(window_.get(), "window-shown");
+    StartupTrace::instance().startStallWatch();
     window_->show();
 }
 
@@ -89,6 +126,11 @@ void Application::Shutdown() {
     if (backends_.audio) backends_.audio->stop();
     midiSetup_->CloseMidiInPort();
     midiSetup_->CloseMidiOutPort();
+}
+
+void Application::ShowAbout() {
+    AboutBox about(AboutBox::Mode::About, window_.get());
+    about.exec();
 }
 
 void Application::AllSoundsOff() {

@@ -12,6 +12,8 @@
 
 class AudioEngine;
 class ComputerKeyboard;
+class GlobalMidiCommands;
+class PadControls;
 class GmNames;
 class InputDispatcher;
 class MainWindow;
@@ -30,6 +32,8 @@ struct Backends {
     std::unique_ptr<MidiOutputPort> midiOut;
     QString instrumentList;
     QString drumList;
+    // How long the start-up splash stays (tests shorten it).
+    int splashMilliseconds = 3000;
 
     // The audio engine, RtMidi ports, the user's settings, Qt's message boxes and the installed
     // name lists.
@@ -51,8 +55,8 @@ class Application : public QObject {
     explicit Application(Backends backends, QObject* parent = nullptr);
     ~Application() override;
 
-    // The audio engine, the settings defaults, the table reset, the MIDI device check; then the
-    // window is shown.
+    // In this order: the splash, the audio engine, the settings defaults, the volume range, the
+    // table reset, the MIDI device check and the pads' controls; then the window is shown.
     void Start();
     // Releases the pads' channels, stops the audio engine and closes both MIDI ports.
     void Shutdown();
@@ -65,8 +69,13 @@ class Application : public QObject {
     WavePlayback& waves() { return *waves_; }
     Backends& backends() { return backends_; }
 
+    PadControls& pads() { return *pads_; }
+    GlobalMidiCommands& globalCommands() { return *globalCommands_; }
+
     // Esc and "All Sounds Off": every pad silenced, then every MIDI note ended.
     void AllSoundsOff();
+    // The About box from the Help menu: stays until OK.
+    void ShowAbout();
 
   private:
     Context context_;
@@ -78,5 +87,7 @@ class Application : public QObject {
     std::unique_ptr<MidiSetup> midiSetup_;
     std::unique_ptr<MidiInputPump> pump_;
     std::unique_ptr<ComputerKeyboard> keyboard_;
+    std::unique_ptr<PadControls> pads_;
+    std::unique_ptr<GlobalMidiCommands> globalCommands_;
     bool shutDown_ = false;
 };

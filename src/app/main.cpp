@@ -1,4 +1,6 @@
+#include "about/about_box.h"
 #include "app/application.h"
+#include "components/widgets/dark_theme.h"
 
 #include <QApplication>
 
@@ -7,6 +9,8 @@ int main(int argc, char** argv) {
     qputenv("JACK_NO_START_SERVER", "1");
     QApplication app(argc, argv);
     QApplication::setApplicationName(QStringLiteral("Orvelle Quindara"));
+    QApplication::setWindowIcon(AboutBox::ProgramIcon());
+    ApplyDarkTheme(app);
     Application program(Backends::Real());
     program.Start();
     return QApplication::exec();

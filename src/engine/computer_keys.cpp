@@ -24,6 +24,21 @@ int ComputerKeyboard::PadNoteForKey(int keyCode) {
     return -1;
 }
 
+bool ComputerKeyboard::Handles(int keyCode) {
+    switch (keyCode) {
+        case kCtrl:
+        case kEsc:
+        case kT:
+        case kKeypad2:
+        case kKeypad4:
+        case kKeypad6:
+        case kKeypad8:
+            return true;
+        default:
+            return PadNoteForKey(keyCode) >= 0;
+    }
+}
+
 void ComputerKeyboard::KeyDown(int keyCode) {
     if (keyCode == kCtrl) ctrlKeyDown_ = true;
     if (keyCode == kEsc) Run(commands_.allSoundsOff);

@@ -30,6 +30,9 @@ class ComputerKeyboard {
 
     // The pad a key plays, or -1.
     static int PadNoteForKey(int keyCode);
+    // Whether the key means something here (a note key, Ctrl, Esc, T or a keypad command); the
+    // window leaves other keys to the focused control.
+    static bool Handles(int keyCode);
 
     void KeyDown(int keyCode);
     void KeyUp(int keyCode);

@@ -1,55 +1,12 @@
-#include "app/application.h"
-#include "app/main_window.h"
-#include "components/audio/audio_engine.h"
-#include "components/audio/offline_audio_device.h"
-#include "components/audio/recording_wave_channels.h"
-#include "components/midi/loopback_midi.h"
-#include "components/prompts/scripted_prompts.h"
-#include "components/settings/memory_settings_store.h"
+#include "program_fixture.h"
+
+#include "app/pad_strip.h"
+#include "components/widgets/rotary_knob.h"
 #include "support/wave_files.h"
 
-#include <QLineEdit>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QTest>
-#include <QVBoxLayout>
-
-#include <gtest/gtest.h>
-
-namespace {
-
-// The whole program over test backends: loopback MIDI, recording channels, scripted prompts.
-struct ProgramTest : ::testing::Test {
-    MemorySettingsStore* settings = new MemorySettingsStore;
-    ScriptedPrompts* prompts = new ScriptedPrompts;
-    RecordingWaveChannels* channels = new RecordingWaveChannels;
-    LoopbackMidiInput* midiIn = new LoopbackMidiInput({QStringLiteral("Keys")});
-    LoopbackMidiOutput* midiOut =
-        new LoopbackMidiOutput({QStringLiteral("Synth"), QStringLiteral("Drums")});
-    std::unique_ptr<Application> program;
-    std::unique_ptr<AudioEngine> audio;  // when set, the pads play through it
-
-    void Build() {
-        Backends backends;
-        backends.audio = std::move(audio);
-        backends.settings.reset(settings);
-        backends.prompts.reset(prompts);
-        backends.channels.reset(channels);
-        backends.midiIn.reset(midiIn);
-        backends.midiOut.reset(midiOut);
-        backends.instrumentList = QStringLiteral(OQ_SOURCE_DATA_DIR "/genmidi.txt");
-        backends.drumList = QStringLiteral(OQ_SOURCE_DATA_DIR "/genmididrums.txt");
-        program = std::make_unique<Application>(std::move(backends));
-    }
-
-    void StoreDevices(int in, int out) {
-        settings->setValue("MIDI", "MIDI_Error_Check", "14");  // "Keys" + "Synth" + "Drums"
-        settings->setValue("MIDI", "MIDI_Input", QString::number(in));
-        settings->setValue("MIDI", "MIDI_Output", QString::number(out));
-    }
-};
-
-}  // namespace
 
 TEST_F(ProgramTest, FirstRunAsksForDevicesAndStartsWithTheDefaultTable) {
     Build();
@@ -94,24 +51,26 @@ TEST_F(ProgramTest, ComputerKeysReachThePadsWhicheverControlHasTheFocus) {
     Build();
     program->Start();
     MainWindow& window = program->window();
-    auto* field = new QLineEdit;
-    window.setCentralWidget(field);
     window.activateWindow();
-    field->setFocus();
+    RotaryKnob* knob = window.pad(66)->knobPan;
+    knob->setFocus();
     ASSERT_TRUE(QTest::qWaitForWindowExposed(&window));
     midiOut->sent.clear();
 
-    QTest::keyPress(field, Qt::Key_C);
+    QTest::keyPress(knob, Qt::Key_C);
     EXPECT_EQ(midiOut->sent.size(), 4u);
     EXPECT_TRUE(window.KeyShownPressed(60));
-    QTest::keyRelease(field, Qt::Key_C);
+    QTest::keyRelease(knob, Qt::Key_C);
     EXPECT_EQ(midiOut->sent.back(), (ShortMessage{144, 60, 0}));
     EXPECT_FALSE(window.KeyShownPressed(60));
-    EXPECT_TRUE(field->text().isEmpty()) << "the note key never types into the field";
 
+    // Keys the pads do not use stay with the focused control.
+    const int pan = knob->value();
+    QTest::keyClick(knob, Qt::Key_Right);
+    EXPECT_NE(knob->value(), pan);
     // Esc: every pad silenced, then the 2048-message sweep.
     midiOut->sent.clear();
-    QTest::keyClick(field, Qt::Key_Escape);
+    QTest::keyClick(knob, Qt::Key_Escape);
     EXPECT_EQ(midiOut->sent.size(), 2048u);
 }
 

@@ -19,16 +19,6 @@ struct ComputerKeysTest : DispatchTest {
                 keys << QString::number(note) + (pressed ? " down" : " up");
             }}};
 
-    // Note-ons and note-offs the MIDI slots sent (bank, program and pan left out).
-    QStringList Notes() const {
-        QStringList notes;
-        for (const ShortMessage& m : midiOut.sent) {
-            if (m.status == 144)
-                notes << QStringLiteral("%1 %2").arg(m.data1).arg(m.data2 ? "on" : "off");
-        }
-        return notes;
-    }
-
     void Feed(QEvent::Type type, int key, Qt::KeyboardModifiers modifiers = Qt::NoModifier,
               bool autoRepeat = false) {
         QKeyEvent event(type, key, modifiers, QString(), autoRepeat);

@@ -27,8 +27,8 @@ class MixerWaveChannel : public WaveChannel {
     void close() override;
     bool isPlaying() const override { return playing_; }
 
-    float peakLeft() const { return mixer_.peakLeft(voice_); }
-    float peakRight() const { return mixer_.peakRight(voice_); }
+    float peakLeft() const override { return mixer_.peakLeft(voice_); }
+    float peakRight() const override { return mixer_.peakRight(voice_); }
     // The loaded sound's length in frames and its own rate (0 without a sound).
     std::int64_t frames() const { return buffer_ ? buffer_->frames : 0; }
     int fileRate() const { return buffer_ ? buffer_->sampleRate : 0; }

@@ -26,6 +26,9 @@ class WaveChannel {
     virtual void close() = 0;
     // The user-interface thread's view: true from a start until a stop or a delivered end notice.
     virtual bool isPlaying() const = 0;
+    // The output peaks (0..1) of the last period, for the pad's level meters.
+    virtual float peakLeft() const { return 0.0f; }
+    virtual float peakRight() const { return 0.0f; }
 };
 
 // The sixteen pad channels, indexed by pad note 57..72, and the end-of-playback notice.

@@ -1,0 +1,233 @@
+// The built program started for real under Xvfb with a private JACK server: how soon the splash
+// and then the main window are on screen, how much memory it holds once running, and how long
+// its user-interface thread is ever blocked while a flood of MIDI notes arrives.
+#include <QDir>
+#include <QElapsedTimer>
+#include <QFile>
+#include <QProcess>
+#include <QStandardPaths>
+#include <QTemporaryDir>
+#include <QThread>
+
+#include <benchmark/benchmark.h>
+#include <rtmidi/RtMidi.h>
+
+#include <chrono>
+#include <memory>
+#include <thread>
+
+namespace {
+
+// A server process of the benchmark's own, ended by its process when the benchmark ends.
+class Server {
+  public:
+    ~Server() {
+        if (process_.state() != QProcess::NotRunning) {
+            process_.terminate();
+            if (!process_.waitForFinished(3000)) process_.kill();
+            process_.waitForFinished(3000);
+        }
+    }
+    bool start(const QString& program, const QStringList& arguments,
+               const QProcessEnvironment& env) {
+        process_.setProcessEnvironment(env);
+        process_.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+        process_.setStandardOutputFile(QProcess::nullDevice());
+        process_.start(program, arguments);
+        return process_.waitForStarted(5000);
+    }
+
+  private:
+    QProcess process_;
+};
+
+bool WaitFor(const std::function<bool()>& condition, int milliseconds) {
+    QElapsedTimer clock;
+    clock.start();
+    while (!condition()) {
+        if (clock.elapsed() > milliseconds) return false;
+        QThread::msleep(20);
+    }
+    return true;
+}
+
+// The system's monotonic clock, which the program's trace uses too.
+qint64 MonotonicMilliseconds() {
+    QElapsedTimer now;
+    now.start();
+    return now.msecsSinceReference();
+}
+
+QString ProgramPath() {
+    // bench_startup lives in build/bench; the program in build/.
+    return QDir(QCoreApplication::applicationDirPath())
+        .filePath(QStringLiteral("../orvelle-quindara"));
+}
+
+qint64 ResidentKilobytes(qint64 pid) {
+    QFile status(QStringLiteral("/proc/%1/status").arg(pid));
+    if (!status.open(QIODevice::ReadOnly)) return -1;
+    for (const QByteArray& line : status.readAll().split('\n')) {
+        if (line.startsWith("VmRSS:")) return line.mid(6).trimmed().split(' ').first().toLongLong();
+    }
+    return -1;
+}
+
+}  // namespace
+
+static void startup(benchmark::State& state) {
+    for (const char* tool : {"Xvfb", "jackd", "jack_wait"}) {
+        if (QStandardPaths::findExecutable(QString::fromLatin1(tool)).isEmpty()) {
+            state.SkipWithError((std::string(tool) + " is not installed").c_str());
+            return;
+        }
+    }
+    if (!QFile::exists(ProgramPath())) {
+        state.SkipWithError("the program is not built next to the benchmarks");
+        return;
+    }
+    QTemporaryDir home;
+    const QString display = QStringLiteral(":%1").arg(90 + QCoreApplication::applicationPid() % 9);
+    const QString jackName =
+        QStringLiteral("oq-bench-start-%1").arg(QCoreApplication::applicationPid());
+    QProcessEnvironment env = QProcessEnvironment::systemEnvironment();
+    env.insert("JACK_NO_START_SERVER", "1");
+    env.insert("JACK_DEFAULT_SERVER", jackName);
+    env.insert("XDG_RUNTIME_DIR", home.filePath("runtime"));
+    env.insert("XDG_CONFIG_HOME", home.filePath("config"));
+    QDir(home.path()).mkpath("runtime");
+    QFile::setPermissions(home.filePath("runtime"),
+                          QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    qputenv("JACK_NO_START_SERVER", "1");
+    qputenv("JACK_DEFAULT_SERVER", jackName.toUtf8());
+
+    Server xvfb, jack;
+    if (!xvfb.start("Xvfb", {display, "-screen", "0", "1920x1080x24", "-nolisten", "tcp"}, env) ||
+        !WaitFor([&] { return QFile::exists("/tmp/.X11-unix/X" + display.mid(1)); }, 10000)) {
+        state.SkipWithError("Xvfb did not start");
+        return;
+    }
+    if (!jack.start(
+            "jackd",
+            {"-n", jackName, "-S", "--no-realtime", "-d", "dummy", "-r", "48000", "-p", "256"},
+            env) ||
+        QProcess::execute("jack_wait", {"-s", jackName, "-w", "-t", "10"}) != 0) {
+        state.SkipWithError("jackd did not start");
+        return;
+    }
+
+    // The program's MIDI In reads the flood port; its MIDI Out plays into a sink. Both exist
+    // before it starts and the stored fingerprint matches, so start-up asks nothing.
+    auto flood = std::make_unique<RtMidiOut>(RtMidi::UNIX_JACK, "oq-bench-flood");
+    flood->openVirtualPort("notes");
+    auto sink = std::make_unique<RtMidiIn>(RtMidi::UNIX_JACK, "oq-bench-sink");
+    sink->openVirtualPort("in");
+    sink->setCallback([](double, std::vector<unsigned char>*, void*) {}, nullptr);
+    auto lister = std::make_unique<RtMidiIn>(RtMidi::UNIX_JACK, "oq-bench-lister");
+    auto outLister = std::make_unique<RtMidiOut>(RtMidi::UNIX_JACK, "oq-bench-lister-out");
+    int fingerprint = 0, floodIndex = -1, sinkIndex = -1;
+    for (unsigned i = 0; i < lister->getPortCount(); ++i) {
+        const QString name = QString::fromStdString(lister->getPortName(i));
+        fingerprint += name.size();
+        if (name.startsWith("oq-bench-flood")) floodIndex = static_cast<int>(i);
+    }
+    for (unsigned i = 0; i < outLister->getPortCount(); ++i) {
+        const QString name = QString::fromStdString(outLister->getPortName(i));
+        fingerprint += name.size();
+        if (name.startsWith("oq-bench-sink")) sinkIndex = static_cast<int>(i);
+    }
+    lister.reset();
+    outLister.reset();
+    const QString settingsDir = home.filePath("config/Tarvik Radio Orvelle Quindara");
+    QDir().mkpath(settingsDir);
+    QFile ini(settingsDir + "/Tarvik Radio Orvelle Quindara.ini");
+    ini.open(QIODevice::WriteOnly);
+    ini.write(QStringLiteral("[MIDI]\nMIDI_Error_Check=%1\nMIDI_Input=%2\nMIDI_Output=%3\n")
+                  .arg(fingerprint)
+                  .arg(floodIndex)
+                  .arg(sinkIndex)
+                  .toUtf8());
+    ini.close();
+
+    double toSplash = 0, afterSplash = 0, rss = 0, maxBlock = 0;
+    for (auto _ : state) {
+        QProcess program;
+        QProcessEnvironment programEnv = env;
+        programEnv.insert("DISPLAY", display);
+        programEnv.insert("QT_QPA_PLATFORM", "xcb");
+        programEnv.insert("OQ_TRACE_STARTUP", "1");
+        program.setProcessEnvironment(programEnv);
+        program.setProcessChannelMode(QProcess::SeparateChannels);
+        program.setStandardErrorFile(home.filePath("program.log"));
+        const qint64 launched = MonotonicMilliseconds();
+        program.start(ProgramPath(), {});
+        QHash<QString, qint64> marks;
+        QList<QPair<qint64, qint64>> stalls;  // (time, longest gap in the second before it)
+        auto readLines = [&] {
+            while (program.canReadLine()) {
+                const QList<QByteArray> words = program.readLine().trimmed().split(' ');
+                if (words.size() == 2)
+                    marks.insert(QString::fromLatin1(words[0]), words[1].toLongLong());
+                if (words.size() == 3 && words[0] == "ui-block-ms")
+                    stalls.append({words[2].toLongLong(), words[1].toLongLong()});
+            }
+        };
+        const bool shown = WaitFor(
+            [&] {
+                program.waitForReadyRead(50);
+                readLines();
+                return marks.contains("window-shown");
+            },
+            20000);
+        if (!shown) {
+            state.SkipWithError("the main window did not appear (see program.log)");
+            program.kill();
+            program.waitForFinished();
+            return;
+        }
+        toSplash = marks.value("splash-shown") - launched;
+        afterSplash = marks.value("window-shown") - marks.value("splash-closed");
+
+        WaitFor(
+            [&] {
+                program.waitForReadyRead(50);
+                readLines();
+                return false;
+            },
+            3000);
+        rss = ResidentKilobytes(program.processId()) / 1024.0;
+
+        // 10,000 note messages within one second: ten every millisecond, on and off in turn.
+        const qint64 floodStart = MonotonicMilliseconds();
+        std::vector<unsigned char> message(3);
+        const auto begin = std::chrono::steady_clock::now();
+        for (int i = 0; i < 10000; ++i) {
+            message[0] = 0x90;
+            message[1] = static_cast<unsigned char>(57 + i % 16);
+            message[2] = static_cast<unsigned char>((i / 16) % 2 ? 0 : 100);
+            flood->sendMessage(&message);
+            if (i % 10 == 9)
+                std::this_thread::sleep_until(begin + std::chrono::milliseconds(i / 10 + 1));
+        }
+        const qint64 floodEnd = MonotonicMilliseconds();
+        WaitFor(
+            [&] {
+                program.waitForReadyRead(50);
+                readLines();
+                return false;
+            },
+            2500);
+        for (const auto& [time, gap] : stalls) {
+            if (time > floodStart && time <= floodEnd + 2000)
+                maxBlock = std::max(maxBlock, static_cast<double>(gap));
+        }
+        program.terminate();
+        if (!program.waitForFinished(5000)) program.kill();
+        program.waitForFinished();
+    }
+    state.counters["startup_to_splash_ms"] = toSplash;
+    state.counters["startup_after_splash_ms"] = afterSplash;
+    state.counters["rss_after_start_mb"] = rss;
+    state.counters["midi_flood_max_block_ms"] = maxBlock;
+}
+BENCHMARK(startup)->Iterations(1)->Unit(benchmark::kMillisecond);
