@@ -20,6 +20,36 @@
 
 #include <QGuiApplication>
 #include <QScreen>
+#include <QTimer>
+
+namespace {
+
+// Runs `then` once the widget has painted for the first time, so it is already on screen.
+class AfterFirstPaint : public QObject {
+  public:
+    AfterFirstPaint(QWidget* widget, std::function<void()> then)
+        : QObject(widget), then_(std::move(then)) {
+        widget->installEventFilter(this);
+    }
+
+  protected:
+    bool eventFilter(QObject* watched, QEvent* event) override {
+        if (event->type() == QEvent::Paint && then_) {
+            watched->removeEventFilter(this);
+            QTimer::singleShot(0, this, std::exchange(then_, nullptr));
+        }
+        return false;
+    }
+
+  private:
+    std::function<void()> then_;
+};
+
+void RunAfterFirstPaint(QWidget* widget, std::function<void()> then) {
+    new AfterFirstPaint(widget, std::move(then));
+}
+
+}  // namespace
 
 Backends::Backends() = default;
 Backends::Backends(Backends&&) noexcept = default;
@@ -84,25 +114,29 @@ Application::~Application() {
 }
 
 void Application::Start() {
-    // The splash first; start-up goes on when it has closed itself or OK was pressed.
+    // The splash first; start-up goes on when it has closed itself or OK was pressed. The sound
+    // device opens while the splash shows, so its fraction of a second is not waited for again.
+    bool audioStarted = false;
+    auto startAudio = [this, &audioStarted] {
+        if (audioStarted) return;
+        audioStarted = true;
+        StartAudio();
+    };
     {
         AboutBox splash(AboutBox::Mode::Splash);
         splash.setSplashInterval(backends_.splashMilliseconds);
+        // Filters run newest first: the trace, installed last, notes the paint before the
+        // sound device is opened.
+        RunAfterFirstPaint(&splash, startAudio);
         StartupTrace::instance().watchFirstPaint(&splash, "splash-shown");
         splash.exec();
         StartupTrace::instance().mark("splash-closed");
     }
+    startAudio();
     // Centred on the screen, at the size its layout asks for.
     window_->resize(window_->sizeHint().expandedTo(QSize(1180, 720)));
     if (const QScreen* screen = QGuiApplication::primaryScreen()) {
         window_->move(screen->availableGeometry().center() - window_->rect().center());
-    }
-    if (backends_.audio) {
-        connect(backends_.audio.get(), &AudioEngine::statusNotice, window_.get(),
-                &MainWindow::ShowStatus);
-        // Sound before the table: the table reset releases the pads' channels.
-        backends_.audio->start();
-        window_->ShowDeviceSummary(backends_.audio->outputDescription());
     }
     GetStartupDefaults(context_, *backends_.settings);
     window_->SetAudioVolumeRange();
@@ -116,6 +150,15 @@ void Application::Start() {
     StartupTrace::instance().watchFirstPaint(window_.get(), "window-shown");
     StartupTrace::instance().startStallWatch();
     window_->show();
+}
+
+// Sound before the table: the table reset releases the pads' channels.
+void Application::StartAudio() {
+    if (!backends_.audio) return;
+    connect(backends_.audio.get(), &AudioEngine::statusNotice, window_.get(),
+            &MainWindow::ShowStatus);
+    backends_.audio->start();
+    window_->ShowDeviceSummary(backends_.audio->outputDescription());
 }
 
 void Application::Shutdown() {

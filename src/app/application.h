@@ -78,6 +78,8 @@ class Application : public QObject {
     void ShowAbout();
 
   private:
+    void StartAudio();
+
     Context context_;
     Backends backends_;
     std::unique_ptr<GmNames> names_;
