@@ -17,7 +17,9 @@
 #include "midi/midi_setup.h"
 #include "midi/startup_device_check.h"
 #include "pickers/gm_names.h"
+#include "setup_files/file_commands.h"
 
+#include <QCursor>
 #include <QGuiApplication>
 #include <QScreen>
 #include <QTimer>
@@ -104,6 +106,26 @@ Application::Application(Backends backends, QObject* parent)
                                           display);
     globalCommands_ = std::make_unique<GlobalMidiCommands>(context_, *names_);
     window_->Attach(context_, *pads_, *globalCommands_, *keyboard_, backends_.padChannels());
+    FileCommands::Window fileWindow;
+    fileWindow.updateUserControls = [this] { window_->UpdateUserControls(); };
+    fileWindow.setTitle = [this](const QString& title) { window_->setWindowTitle(title); };
+    fileWindow.showBusy = [](bool busy) {
+        if (busy) {
+            QGuiApplication::setOverrideCursor(Qt::WaitCursor);
+        } else {
+            QGuiApplication::restoreOverrideCursor();
+        }
+    };
+    fileWindow.close = [this] { window_->close(); };
+    fileCommands_ =
+        std::make_unique<FileCommands>(context_, backends_.padChannels(), *names_, *midiSetup_,
+                                       *backends_.prompts, *backends_.settings, fileWindow);
+    connect(window_.get(), &MainWindow::newRequested, this, [this] { fileCommands_->New(); });
+    connect(window_.get(), &MainWindow::openRequested, this, [this] { fileCommands_->Open(); });
+    connect(window_.get(), &MainWindow::saveRequested, this, [this] { fileCommands_->Save(); });
+    connect(window_.get(), &MainWindow::saveAsRequested, this, [this] { fileCommands_->SaveAs(); });
+    connect(window_.get(), &MainWindow::exitRequested, this, [this] { fileCommands_->Exit(); });
+    window_->SetCloseCheck([this] { return fileCommands_->CloseAllowed(); });
     connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
     connect(window_.get(), &MainWindow::allSoundsOffRequested, this, &Application::AllSoundsOff);
     connect(window_.get(), &MainWindow::aboutRequested, this, &Application::ShowAbout);

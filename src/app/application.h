@@ -12,6 +12,7 @@
 
 class AudioEngine;
 class ComputerKeyboard;
+class FileCommands;
 class GlobalMidiCommands;
 class PadControls;
 class GmNames;
@@ -71,6 +72,7 @@ class Application : public QObject {
 
     PadControls& pads() { return *pads_; }
     GlobalMidiCommands& globalCommands() { return *globalCommands_; }
+    FileCommands& fileCommands() { return *fileCommands_; }
 
     // Esc and "All Sounds Off": every pad silenced, then every MIDI note ended.
     void AllSoundsOff();
@@ -91,5 +93,6 @@ class Application : public QObject {
     std::unique_ptr<ComputerKeyboard> keyboard_;
     std::unique_ptr<PadControls> pads_;
     std::unique_ptr<GlobalMidiCommands> globalCommands_;
+    std::unique_ptr<FileCommands> fileCommands_;
     bool shutDown_ = false;
 };

@@ -90,16 +90,19 @@ void MainWindow::BuildMenus() {
     };
     // Entries whose windows come later are present but disabled.
     QMenu* file = menuBar()->addMenu(QStringLiteral("&File"));
-    mnuNew = action(file, "mnuNew", "New", QKeySequence::New, false);
+    mnuNew = action(file, "mnuNew", "New", QKeySequence::New);
     file->addSeparator();
-    mnuOpen = action(file, "mnuOpen", "Open", QKeySequence::Open, false);
-    mnuSave = action(file, "mnuSave", "Save", QKeySequence::Save, false);
+    mnuOpen = action(file, "mnuOpen", "Open", QKeySequence::Open);
+    mnuSave = action(file, "mnuSave", "Save", QKeySequence::Save);
     file->addSeparator();
-    mnuSaveAs =
-        action(file, "mnuSaveAs", "Save As", QKeySequence(QStringLiteral("Ctrl+Shift+S")), false);
+    mnuSaveAs = action(file, "mnuSaveAs", "Save As", QKeySequence(QStringLiteral("Ctrl+Shift+S")));
     file->addSeparator();
     mnuExit = action(file, "mnuExit", "Exit", QKeySequence(QStringLiteral("Ctrl+Q")));
-    connect(mnuExit, &QAction::triggered, this, &QWidget::close);
+    connect(mnuNew, &QAction::triggered, this, &MainWindow::newRequested);
+    connect(mnuOpen, &QAction::triggered, this, &MainWindow::openRequested);
+    connect(mnuSave, &QAction::triggered, this, &MainWindow::saveRequested);
+    connect(mnuSaveAs, &QAction::triggered, this, &MainWindow::saveAsRequested);
+    connect(mnuExit, &QAction::triggered, this, &MainWindow::exitRequested);
 
     QMenu* edit = menuBar()->addMenu(QStringLiteral("&Edit Audio"));
     edit->setObjectName(QStringLiteral("mnuEditAudio"));
@@ -439,6 +442,10 @@ void MainWindow::changeEvent(QEvent* event) {
 }
 
 void MainWindow::closeEvent(QCloseEvent* event) {
+    if (closeCheck_ && !closeCheck_()) {
+        event->ignore();
+        return;
+    }
     event->accept();
     emit closed();
 }

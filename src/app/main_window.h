@@ -4,6 +4,7 @@
 #include <QTimer>
 
 #include <array>
+#include <functional>
 
 class ComputerKeyboard;
 class GlobalMidiCommands;
@@ -78,8 +79,16 @@ class MainWindow : public QMainWindow {
     QAction* mnuMetronome = nullptr;
     QAction* mnuAbout = nullptr;
 
+    // Asked before the window closes, by any means; false keeps it open.
+    void SetCloseCheck(std::function<bool()> check) { closeCheck_ = std::move(check); }
+
   signals:
     void closed();
+    void newRequested();
+    void openRequested();
+    void saveRequested();
+    void saveAsRequested();
+    void exitRequested();
     void allSoundsOffRequested();
     void aboutRequested();
 
@@ -114,4 +123,5 @@ class MainWindow : public QMainWindow {
     QTimer timerHideTransposeInfoBar;
     QTimer meterTimer_;
     int markedKey_ = -1;
+    std::function<bool()> closeCheck_;
 };

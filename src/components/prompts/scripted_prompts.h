@@ -4,12 +4,17 @@
 
 #include <QQueue>
 
+#include <functional>
+
 // The test backend: answers from a script and remembers everything it was asked.
 class ScriptedPrompts : public Prompts {
-public:
+  public:
     QList<MessagePrompt> shownMessages;
     QList<FileDialogRequest> shownOpenDialogs;
     QList<FileDialogRequest> shownSaveDialogs;
+
+    // Runs while a file dialog is "open", so a test can look at the program meanwhile.
+    std::function<void()> whileFileDialogShown;
 
     void answerNext(PromptButton button) { answers_.enqueue(button); }
     void chooseFileNext(const QString& path) { files_.enqueue(path); }
@@ -21,14 +26,16 @@ public:
     }
     QString openFileName(const FileDialogRequest& request) override {
         shownOpenDialogs.append(request);
+        if (whileFileDialogShown) whileFileDialogShown();
         return files_.isEmpty() ? QString() : files_.dequeue();
     }
     QString saveFileName(const FileDialogRequest& request) override {
         shownSaveDialogs.append(request);
+        if (whileFileDialogShown) whileFileDialogShown();
         return files_.isEmpty() ? QString() : files_.dequeue();
     }
 
-private:
+  private:
     QQueue<PromptButton> answers_;
     QQueue<QString> files_;
 };
