@@ -10,6 +10,8 @@
 #include "engine/input_dispatcher.h"
 
 #include <QApplication>
+#include <QDialog>
+#include <QPushButton>
 #include <QLabel>
 #include <QStatusBar>
 
@@ -212,4 +214,16 @@ TEST_F(MainWindowTest, EscapeAndAllSoundsOffSilenceEverything) {
     midiOut->sent.clear();
     window->mnuAllSoundsOff->trigger();
     EXPECT_EQ(midiOut->sent.size(), 2048u);
+}
+
+TEST_F(MainWindowTest, HelpAboutStaysUntilOk) {
+    bool stillOpenAfterASecond = false;
+    QTimer::singleShot(1200, [&] {
+        auto* box = qobject_cast<QDialog*>(QApplication::activeModalWidget());
+        stillOpenAfterASecond = box && box->windowTitle() == "About Orvelle Quindara...";
+        if (auto* ok = box ? box->findChild<QPushButton*>("cmdOK") : nullptr) ok->click();
+    });
+    window->mnuAbout->trigger();  // returns once OK closed it
+    EXPECT_TRUE(stillOpenAfterASecond);
+    EXPECT_EQ(QApplication::activeModalWidget(), nullptr);
 }
