@@ -1,0 +1,303 @@
+#include "jack_peer.h"
+#include "midi_fixture.h"
+
+#include "components/midi/rtmidi_input_port.h"
+#include "components/midi/rtmidi_output_port.h"
+#include "components/settings/memory_settings_store.h"
+#include "components/settings/qsettings_store.h"
+#include "midi/midi_setup_dialog.h"
+#include "midi/startup_device_check.h"
+
+#include <QComboBox>
+#include <QLabel>
+#include <QPushButton>
+#include <QRegularExpression>
+#include <QScreen>
+#include <QTemporaryDir>
+#include <QTest>
+
+#include <memory>
+
+namespace {
+
+const QString kMidi = QStringLiteral("MIDI");
+const ShortMessage kTestNoteOn{144, 60, 100};
+const ShortMessage kTestNoteOff{144, 60, 0};
+
+// Remembers the order in which keys were written.
+struct RecordingSettingsStore : MemorySettingsStore {
+    QStringList writtenKeys;
+    void setValue(const QString& group, const QString& key, const QString& text) override {
+        writtenKeys.append(group + u'/' + key);
+        MemorySettingsStore::setValue(group, key, text);
+    }
+};
+
+QComboBox* List(const QDialog& dialog, const char* name) {
+    return dialog.findChild<QComboBox*>(QLatin1String(name));
+}
+
+QPushButton* Button(const QDialog& dialog, const char* name) {
+    return dialog.findChild<QPushButton*>(QLatin1String(name));
+}
+
+QStringList Items(const QComboBox* list) {
+    QStringList items;
+    for (int i = 0; i < list->count(); ++i) items.append(list->itemText(i));
+    return items;
+}
+
+struct MidiSetupDialogTest : MidiTest {
+    RecordingSettingsStore settings;
+
+    void SetUp() override {
+        midiIn.setDeviceNames({QStringLiteral("Keys")});
+        midiOut.setDeviceNames({QStringLiteral("Synth"), QStringLiteral("Drums")});
+    }
+    std::unique_ptr<MidiSetupDialog> Show() {
+        auto dialog = std::make_unique<MidiSetupDialog>(context, setup, settings);
+        dialog->show();
+        return dialog;
+    }
+    QString Stored(const char* key) const { return settings.value(kMidi, QLatin1String(key)); }
+};
+
+}  // namespace
+
+TEST_F(MidiSetupDialogTest, LoadingListsTheDevicesByNameAndSelectsTheCurrentOnes) {
+    context.MidiOutDevice = 1;
+    context.MidiDeviceNamesLength = 99;  // from an earlier check
+    auto dialog = Show();
+
+    EXPECT_EQ(Items(List(*dialog, "ComboMIDIIN")), QStringList{"Keys"});
+    EXPECT_EQ(Items(List(*dialog, "ComboMIDIOUT")), (QStringList{"Synth", "Drums"}));
+    EXPECT_EQ(List(*dialog, "ComboMIDIIN")->currentIndex(), 0);
+    EXPECT_EQ(List(*dialog, "ComboMIDIOUT")->currentIndex(), 1);
+    EXPECT_EQ(context.MidiDeviceNamesLength, 14);
+    EXPECT_TRUE(context.MidiOutAvailable);
+    EXPECT_FALSE(midiOut.isOpen());
+    const QRect screen = dialog->screen()->geometry();
+    EXPECT_EQ(dialog->x(), screen.x() + (screen.width() - dialog->width()) / 2);
+    EXPECT_EQ(dialog->y(), screen.y() + (screen.height() - dialog->height()) / 2);
+
+    // A stored device that no longer exists offers the first one; an empty list selects none.
+    context.MidiOutDevice = 5;
+    midiIn.setDeviceNames({});
+    MidiSetupDialog again(context, setup, settings);
+    EXPECT_EQ(List(again, "ComboMIDIOUT")->currentIndex(), 0);
+    EXPECT_EQ(List(again, "ComboMIDIIN")->currentIndex(), -1);
+    EXPECT_FALSE(context.MidiInAvailable);
+    EXPECT_EQ(context.MidiDeviceNamesLength, 10);
+}
+
+TEST_F(MidiSetupDialogTest, MoreInfoOnlyUncoversTheExplanations) {
+    auto dialog = Show();
+    const QList<QLabel*> labels =
+        dialog->findChildren<QLabel*>(QRegularExpression(QStringLiteral("^lblinfo")));
+    ASSERT_EQ(labels.size(), 5);
+    for (QLabel* label : labels) EXPECT_FALSE(label->isVisible()) << label->objectName();
+    const int heightBefore = dialog->height();
+
+    QTest::mouseClick(Button(*dialog, "cmdMoreInfo"), Qt::LeftButton);
+    for (QLabel* label : labels) EXPECT_TRUE(label->isVisible()) << label->objectName();
+    EXPECT_GT(dialog->height(), heightBefore);
+    EXPECT_TRUE(dialog->isVisible());
+    EXPECT_TRUE(settings.writtenKeys.isEmpty());
+    EXPECT_FALSE(midiOut.isOpen());
+}
+
+TEST_F(MidiSetupDialogTest, TestMidiOutSoundsMiddleCOnTheListedDeviceWhileHeld) {
+    ASSERT_TRUE(midiOut.open(0));  // the engine's port, as start-up left it
+    auto dialog = Show();
+    List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
+    QPushButton* test = Button(*dialog, "cmdTestMidi");
+
+    QTest::mousePress(test, Qt::LeftButton);
+    EXPECT_EQ(midiOut.sent, std::vector<ShortMessage>{kTestNoteOn});
+    EXPECT_EQ(midiOut.deviceIndex(), 1);
+    QTest::mouseRelease(test, Qt::LeftButton);
+    EXPECT_EQ(midiOut.sent, (std::vector<ShortMessage>{kTestNoteOn, kTestNoteOff}));
+    EXPECT_FALSE(midiOut.isOpen());
+}
+
+TEST_F(MidiSetupDialogTest, OkStoresTheFiveKeysInOrderAndOpensBothPorts) {
+    context.MidiOutDevice = 0;
+    auto dialog = Show();
+    List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
+    QTest::mouseClick(Button(*dialog, "cmdOK"), Qt::LeftButton);
+
+    EXPECT_EQ(settings.writtenKeys,
+              (QStringList{"MIDI/MIDI_Output", "MIDI/MIDI_Input", "MIDI/MIDI_OutputName",
+                           "MIDI/MIDI_InputName", "MIDI/MIDI_Error_Check"}));
+    EXPECT_EQ(Stored("MIDI_Output"), "1");
+    EXPECT_EQ(Stored("MIDI_Input"), "0");
+    EXPECT_EQ(Stored("MIDI_OutputName"), "Drums");
+    EXPECT_EQ(Stored("MIDI_InputName"), "Keys");
+    EXPECT_EQ(Stored("MIDI_Error_Check"), "14");
+    EXPECT_EQ(context.MidiOutDevice, 1);
+    EXPECT_EQ(context.MidiInDevice, 0);
+    EXPECT_EQ(midiIn.deviceIndex(), 0);
+    EXPECT_EQ(midiOut.deviceIndex(), 1);
+    EXPECT_TRUE(statusTexts.isEmpty());
+    EXPECT_FALSE(dialog->isVisible());
+    EXPECT_EQ(dialog->result(), QDialog::Accepted);
+
+    // Shown again after OK, it is as it was left.
+    midiOut.setDeviceNames({QStringLiteral("Other")});
+    dialog->show();
+    EXPECT_EQ(Items(List(*dialog, "ComboMIDIOUT")), (QStringList{"Synth", "Drums"}));
+}
+
+TEST_F(MidiSetupDialogTest, CancelEscapeAndCloseBoxStoreNothingAndGiveTheOutPortBack) {
+    const std::function<void(MidiSetupDialog&)> waysOut[] = {
+        [](MidiSetupDialog& d) { QTest::mouseClick(Button(d, "cmdCancel"), Qt::LeftButton); },
+        [](MidiSetupDialog& d) { QTest::keyClick(&d, Qt::Key_Escape); },
+        [](MidiSetupDialog& d) { d.close(); },
+    };
+    for (const auto& leave : waysOut) {
+        ASSERT_TRUE(midiOut.open(0));
+        auto dialog = Show();
+        List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
+        QTest::mouseClick(Button(*dialog, "cmdTestMidi"), Qt::LeftButton);
+        ASSERT_FALSE(midiOut.isOpen());
+        leave(*dialog);
+        EXPECT_FALSE(dialog->isVisible());
+        EXPECT_EQ(midiOut.deviceIndex(), 0);
+    }
+    EXPECT_TRUE(settings.writtenKeys.isEmpty());
+    EXPECT_EQ(context.MidiOutDevice, 0);
+
+    // Escape while the note still sounds ends it before the port goes back.
+    midiOut.sent.clear();
+    auto dialog = Show();
+    List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
+    QTest::mousePress(Button(*dialog, "cmdTestMidi"), Qt::LeftButton);
+    QTest::keyClick(dialog.get(), Qt::Key_Escape);
+    EXPECT_EQ(midiOut.sent, (std::vector<ShortMessage>{kTestNoteOn, kTestNoteOff}));
+    EXPECT_EQ(midiOut.deviceIndex(), 0);
+
+    // A port that was closed stays closed; the next showing loads the devices afresh.
+    midiOut.close();
+    midiOut.setDeviceNames({QStringLiteral("Other")});
+    dialog->show();
+    EXPECT_EQ(Items(List(*dialog, "ComboMIDIOUT")), QStringList{"Other"});
+    QTest::mouseClick(Button(*dialog, "cmdTestMidi"), Qt::LeftButton);
+    QTest::mouseClick(Button(*dialog, "cmdCancel"), Qt::LeftButton);
+    EXPECT_FALSE(midiOut.isOpen());
+    EXPECT_TRUE(settings.writtenKeys.isEmpty());
+}
+
+TEST_F(MidiSetupDialogTest, WithoutAnInDeviceOkStoresMinusOneAndSaysSo) {
+    midiIn.setDeviceNames({});
+    auto dialog = Show();
+    QTest::mouseClick(Button(*dialog, "cmdOK"), Qt::LeftButton);
+
+    EXPECT_EQ(Stored("MIDI_Input"), "-1");
+    EXPECT_EQ(Stored("MIDI_InputName"), "");
+    EXPECT_EQ(Stored("MIDI_Output"), "0");
+    EXPECT_EQ(Stored("MIDI_OutputName"), "Synth");
+    EXPECT_EQ(Stored("MIDI_Error_Check"), "10");
+    EXPECT_EQ(context.MidiInDevice, -1);
+    EXPECT_EQ(statusTexts, QStringList{"No avaliable Midi In Devices detected"});
+    EXPECT_EQ(midiOut.deviceIndex(), 0);
+}
+
+namespace {
+
+constexpr int kDeadlineMs = 5000;
+
+// The program's RtMidi ports on the running JACK server, a peer to play to and from, and a
+// second program whose ports must show as well.
+struct JackMidiSetupDialogTest : MidiTest {
+    QTemporaryDir folder;
+    std::unique_ptr<JackPeer> peer;
+    std::unique_ptr<RtMidiIn> bystander;
+    std::unique_ptr<RtMidiOut> bystanderOut;
+
+    void SetUp() override {
+        REQUIRE_JACK_SERVER();
+        peer = std::make_unique<JackPeer>();
+        const std::string name =
+            "oq-test-bystander-" + std::to_string(QCoreApplication::applicationPid());
+        bystander = std::make_unique<RtMidiIn>(RtMidi::UNIX_JACK, name);
+        bystander->openVirtualPort("listens");
+        bystanderOut = std::make_unique<RtMidiOut>(RtMidi::UNIX_JACK, name + "-out");
+        bystanderOut->openVirtualPort("plays");
+    }
+    QString SettingsFile() const { return folder.filePath(QStringLiteral("settings.ini")); }
+};
+
+}  // namespace
+
+TEST_F(JackMidiSetupDialogTest, ChosenPortsHearTheTestNoteAndOpenAgainAtTheNextStart) {
+    RtMidiInputPort jackIn;
+    RtMidiOutputPort jackOut;
+    MidiSetup jackSetup{
+        context, jackIn, jackOut, [this](const QString& text) { statusTexts.append(text); }, {}};
+    QString chosenOut;
+    QString chosenIn;
+    {
+        QSettingsStore store(SettingsFile());
+        MidiSetupDialog dialog(context, jackSetup, store);
+        dialog.show();
+        QComboBox* outList = List(dialog, "ComboMIDIOUT");
+        QComboBox* inList = List(dialog, "ComboMIDIIN");
+        const QStringList outs = Items(outList);
+        const QStringList ins = Items(inList);
+        ASSERT_TRUE(outs.contains(peer->listeningPort())) << outs.join(", ");
+        ASSERT_EQ(outs.filter(QStringLiteral("oq-test-bystander-")).size(), 1) << outs.join(", ");
+        ASSERT_TRUE(ins.contains(peer->playingPort())) << ins.join(", ");
+        ASSERT_EQ(ins.filter(QStringLiteral("oq-test-bystander-")).size(), 1) << ins.join(", ");
+
+        outList->setCurrentIndex(static_cast<int>(outs.indexOf(peer->listeningPort())));
+        inList->setCurrentIndex(static_cast<int>(ins.indexOf(peer->playingPort())));
+        QPushButton* test = Button(dialog, "cmdTestMidi");
+        QTest::mousePress(test, Qt::LeftButton);
+        EXPECT_TRUE(QTest::qWaitFor([&] { return !peer->received().empty(); }, kDeadlineMs));
+        EXPECT_EQ(peer->received(), std::vector<ShortMessage>{kTestNoteOn});
+        QTest::mouseRelease(test, Qt::LeftButton);
+        EXPECT_TRUE(QTest::qWaitFor([&] { return peer->received().size() >= 2; }, kDeadlineMs));
+        EXPECT_EQ(peer->received(), (std::vector<ShortMessage>{kTestNoteOn, kTestNoteOff}));
+        EXPECT_FALSE(jackOut.isOpen());
+        std::vector<unsigned char> strayMessage;
+        bystander->getMessage(&strayMessage);
+        EXPECT_TRUE(strayMessage.empty());
+
+        chosenOut = outList->currentText();
+        chosenIn = inList->currentText();
+        QTest::mouseClick(Button(dialog, "cmdOK"), Qt::LeftButton);
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_OutputName")), chosenOut);
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_InputName")), chosenIn);
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_Output")),
+                  QString::number(outs.indexOf(chosenOut)));
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_Input")),
+                  QString::number(ins.indexOf(chosenIn)));
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_Error_Check")),
+                  QString::number(context.MidiDeviceNamesLength));
+        EXPECT_TRUE(jackIn.isOpen());
+        EXPECT_TRUE(jackOut.isOpen());
+        EXPECT_TRUE(statusTexts.isEmpty()) << statusTexts.join(", ");
+    }
+    jackSetup.CloseMidiInPort();
+    jackSetup.CloseMidiOutPort();
+
+    // The next start: new ports, the same settings file, no question asked.
+    Context restarted;
+    RtMidiInputPort newIn;
+    RtMidiOutputPort newOut;
+    MidiSetup newSetup{restarted, newIn, newOut, {}, {}};
+    QSettingsStore store(SettingsFile());
+    ScriptedPrompts startPrompts;
+    int dialogsShown = 0;
+    EXPECT_EQ(
+        RunStartupMidiCheck(newSetup, restarted, store, startPrompts, [&] { ++dialogsShown; }),
+        StartupMidiOutcome::PortsOpened);
+    EXPECT_TRUE(startPrompts.shownMessages.isEmpty());
+    EXPECT_EQ(dialogsShown, 0);
+    ASSERT_TRUE(newOut.isOpen());
+    ASSERT_TRUE(newIn.isOpen());
+    EXPECT_EQ(newOut.deviceNames().value(newOut.deviceIndex()), chosenOut);
+    EXPECT_EQ(newIn.deviceNames().value(newIn.deviceIndex()), chosenIn);
+    peer->send({144, 61, 1});
+    EXPECT_TRUE(QTest::qWaitFor([&] { return newIn.queueLength() > 0; }, kDeadlineMs));
+}
