@@ -4,6 +4,7 @@
 #include "app/main_window.h"
 #include "app/startup_trace.h"
 #include "components/audio/audio_engine.h"
+#include "components/audio/audio_setup_dialog.h"
 #include "components/midi/rtmidi_input_port.h"
 #include "components/midi/rtmidi_output_port.h"
 #include "components/prompts/qt_prompts.h"
@@ -15,6 +16,7 @@
 #include "engine/wave_playback.h"
 #include "midi/midi_input_pump.h"
 #include "midi/midi_setup.h"
+#include "midi/midi_setup_dialog.h"
 #include "midi/startup_device_check.h"
 #include "pickers/gm_names.h"
 #include "setup_files/file_commands.h"
@@ -129,6 +131,10 @@ Application::Application(Backends backends, QObject* parent)
     connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
     connect(window_.get(), &MainWindow::allSoundsOffRequested, this, &Application::AllSoundsOff);
     connect(window_.get(), &MainWindow::aboutRequested, this, &Application::ShowAbout);
+    window_->mnuMidiSetup->setEnabled(true);
+    connect(window_->mnuMidiSetup, &QAction::triggered, this, &Application::ShowMidiSetup);
+    window_->mnuAudioSetup->setEnabled(backends_.audio != nullptr);
+    connect(window_->mnuAudioSetup, &QAction::triggered, this, &Application::ShowAudioSetup);
 }
 
 Application::~Application() {
@@ -165,8 +171,8 @@ void Application::Start() {
     InitializeAllMidiNotes(context_, *names_, backends_.padChannels());
     context_.GlobalTranspose = 0;
     context_.CurrentFileName.clear();
-    // The MIDI setup dialog joins here when it exists; until then the question alone is asked.
-    RunStartupMidiCheck(*midiSetup_, context_, *backends_.settings, *backends_.prompts, {});
+    RunStartupMidiCheck(*midiSetup_, context_, *backends_.settings, *backends_.prompts,
+                        [this] { ShowMidiSetup(); });
     window_->AlignMidiInfoLabels();
     window_->UpdateUserControls();
     StartupTrace::instance().watchFirstPaint(window_.get(), "window-shown");
@@ -196,6 +202,22 @@ void Application::Shutdown() {
 void Application::ShowAbout() {
     AboutBox about(AboutBox::Mode::About, window_.get());
     about.exec();
+}
+
+void Application::ShowMidiSetup() {
+    if (!midiSetupDialog_) {
+        midiSetupDialog_ = std::make_unique<MidiSetupDialog>(context_, *midiSetup_,
+                                                             *backends_.settings, window_.get());
+    }
+    midiSetupDialog_->exec();
+}
+
+void Application::ShowAudioSetup() {
+    if (!backends_.audio) return;
+    AudioSetupDialog dialog(*backends_.audio, *backends_.settings, window_.get());
+    if (dialog.exec() == QDialog::Accepted) {
+        window_->ShowDeviceSummary(backends_.audio->outputDescription());
+    }
 }
 
 void Application::AllSoundsOff() {

@@ -12,6 +12,7 @@
 
 class AudioEngine;
 class ComputerKeyboard;
+class MidiSetupDialog;
 class FileCommands;
 class GlobalMidiCommands;
 class PadControls;
@@ -78,6 +79,10 @@ class Application : public QObject {
     void AllSoundsOff();
     // The About box from the Help menu: stays until OK.
     void ShowAbout();
+    // Settings > MIDI Setup, and start-up when the MIDI devices changed: modal.
+    void ShowMidiSetup();
+    // Settings > Audio Setup: modal; OK restarts the sound engine.
+    void ShowAudioSetup();
 
   private:
     void StartAudio();
@@ -94,5 +99,6 @@ class Application : public QObject {
     std::unique_ptr<PadControls> pads_;
     std::unique_ptr<GlobalMidiCommands> globalCommands_;
     std::unique_ptr<FileCommands> fileCommands_;
+    std::unique_ptr<MidiSetupDialog> midiSetupDialog_;  // kept after OK, as the user left it
     bool shutDown_ = false;
 };

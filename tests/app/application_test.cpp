@@ -15,6 +15,7 @@ TEST_F(ProgramTest, FirstRunAsksForDevicesAndStartsWithTheDefaultTable) {
     ASSERT_EQ(prompts->shownMessages.size(), 1);
     EXPECT_EQ(prompts->shownMessages[0].title, "MIDI Settings change detected");
     EXPECT_EQ(prompts->shownMessages[0].text, "Please select your MIDI devices now...");
+    EXPECT_EQ(midiSetupDialogsShown, 1) << "then the MIDI setup dialog";
     EXPECT_FALSE(midiIn->isOpen());
     EXPECT_FALSE(midiOut->isOpen());
     EXPECT_EQ(program->context().NoteSlots[60].Description, "MIDI Note C 60  Acoustic Grand Piano");

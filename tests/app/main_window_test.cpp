@@ -11,8 +11,8 @@
 
 #include <QApplication>
 #include <QDialog>
-#include <QPushButton>
 #include <QLabel>
+#include <QPushButton>
 #include <QStatusBar>
 
 namespace {
@@ -226,4 +226,13 @@ TEST_F(MainWindowTest, HelpAboutStaysUntilOk) {
     window->mnuAbout->trigger();  // returns once OK closed it
     EXPECT_TRUE(stillOpenAfterASecond);
     EXPECT_EQ(QApplication::activeModalWidget(), nullptr);
+}
+
+TEST_F(MainWindowTest, SettingsMidiSetupOpensTheDialogAndCancelKeepsThePorts) {
+    ASSERT_TRUE(window->mnuMidiSetup->isEnabled());
+    EXPECT_FALSE(window->mnuAudioSetup->isEnabled()) << "no sound engine in this test";
+    window->mnuMidiSetup->trigger();
+    EXPECT_EQ(midiSetupDialogsShown, 1);
+    EXPECT_TRUE(midiIn->isOpen());
+    EXPECT_TRUE(midiOut->isOpen());
 }

@@ -12,9 +12,12 @@
 #include "components/widgets/rotary_knob.h"
 #include "support/wave_files.h"
 
+#include <QApplication>
+#include <QDialog>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QTest>
+#include <QTimer>
 
 #include <gtest/gtest.h>
 
@@ -29,6 +32,9 @@ struct ProgramTest : ::testing::Test {
     LoopbackMidiOutput* midiOut =
         new LoopbackMidiOutput({QStringLiteral("Synth"), QStringLiteral("Drums")});
     std::unique_ptr<Application> program;
+    // The MIDI setup dialog that start-up shows on a first run is cancelled as soon as it opens.
+    int midiSetupDialogsShown = 0;
+    QTimer dialogCanceller;
     std::unique_ptr<AudioEngine> audio;  // when set, the pads play through it
 
     void Build() {
@@ -43,6 +49,14 @@ struct ProgramTest : ::testing::Test {
         backends.drumList = QStringLiteral(OQ_SOURCE_DATA_DIR "/genmididrums.txt");
         backends.splashMilliseconds = 1;
         program = std::make_unique<Application>(std::move(backends));
+        QObject::connect(&dialogCanceller, &QTimer::timeout, [this] {
+            auto* dialog = qobject_cast<QDialog*>(QApplication::activeModalWidget());
+            if (dialog && dialog->objectName() == "frmMIDISETUP") {
+                ++midiSetupDialogsShown;
+                dialog->reject();
+            }
+        });
+        dialogCanceller.start(10);
     }
 
     void StoreDevices(int in, int out) {
