@@ -108,6 +108,12 @@ Application::Application(Backends backends, QObject* parent)
                                           display);
     globalCommands_ = std::make_unique<GlobalMidiCommands>(context_, *names_);
     window_->Attach(context_, *pads_, *globalCommands_, *keyboard_, backends_.padChannels());
+    WireFileMenu();
+    WireOtherMenus();
+}
+
+// The File menu's commands and the checks before the window closes.
+void Application::WireFileMenu() {
     FileCommands::Window fileWindow;
     fileWindow.updateUserControls = [this] { window_->UpdateUserControls(); };
     fileWindow.setTitle = [this](const QString& title) { window_->setWindowTitle(title); };
@@ -128,6 +134,9 @@ Application::Application(Backends backends, QObject* parent)
     connect(window_.get(), &MainWindow::saveAsRequested, this, [this] { fileCommands_->SaveAs(); });
     connect(window_.get(), &MainWindow::exitRequested, this, [this] { fileCommands_->Exit(); });
     window_->SetCloseCheck([this] { return fileCommands_->CloseAllowed(); });
+}
+
+void Application::WireOtherMenus() {
     connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
     connect(window_.get(), &MainWindow::allSoundsOffRequested, this, &Application::AllSoundsOff);
     connect(window_.get(), &MainWindow::aboutRequested, this, &Application::ShowAbout);

@@ -85,6 +85,8 @@ class Application : public QObject {
     void ShowAudioSetup();
 
   private:
+    void WireFileMenu();
+    void WireOtherMenus();
     void StartAudio();
 
     Context context_;
