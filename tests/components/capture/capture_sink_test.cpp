@@ -1,6 +1,6 @@
 #include "components/audio/capture/capture_sink.h"
 #include "capture_signals.h"
-#include "components/audio/capture/capture_spectrum.h"
+#include "components/audio/capture/capture_bands.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "components/audio/capture/capture_spectrum.h"
+#include "components/audio/capture/capture_bands.h"
 
 #include <fftw3.h>
 
