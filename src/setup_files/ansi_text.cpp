@@ -2,6 +2,9 @@
 
 #include <QStringDecoder>
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 // Windows-1252 differs from Latin-1 only in 0x80..0x9F; the five unassigned codes map to
@@ -22,10 +25,28 @@ QString DecodeWindows1252(const QByteArray& bytes) {
 
 }  // namespace
 
-QByteArray EncodeAnsiText(const QString& text) { return text.toUtf8(); }
+std::optional<QByteArray> EncodeWindows1252(const QString& text) {
+    QByteArray bytes(text.size(), Qt::Uninitialized);
+    for (qsizetype i = 0; i < text.size(); ++i) {
+        const char16_t unit = text[i].unicode();
+        if (unit < 0x80 || (unit >= 0xA0 && unit <= 0xFF)) {
+            bytes[i] = char(unit);
+            continue;
+        }
+        const auto* high = std::find(std::begin(kCp1252High), std::end(kCp1252High), unit);
+        if (high == std::end(kCp1252High)) return std::nullopt;
+        bytes[i] = char(0x80 + (high - std::begin(kCp1252High)));
+    }
+    return bytes;
+}
+
+QByteArray EncodeAnsiText(const QString& text) {
+    return text.toUtf8();
+}
 
 QString DecodeAnsiText(const QByteArray& bytes) {
-    QStringDecoder utf8(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless | QStringDecoder::Flag::ConvertInitialBom);
+    QStringDecoder utf8(QStringDecoder::Utf8,
+                        QStringDecoder::Flag::Stateless | QStringDecoder::Flag::ConvertInitialBom);
     QString text = utf8.decode(bytes);
     if (!utf8.hasError()) return text;
     return DecodeWindows1252(bytes);

@@ -5,6 +5,7 @@
 #include "setup_files/setup_file_format.h"
 
 #include <QFile>
+#include <QFileInfo>
 #include <QSaveFile>
 
 #include <algorithm>
@@ -70,6 +71,14 @@ SetupFileSaveResult SaveSetupFile(const NoteSlotTable& table, const QString& pat
 }
 
 SetupFileOpenResult OpenSetupFile(Context& context, WaveChannels& channels, const QString& path) {
+    // Only a plain file: opening a pipe would wait for a writer for ever, and a device or a folder
+    // holds no setup.
+    const QFileInfo info(path);
+    if (info.exists() && !info.isFile()) {
+        return {CannotOpen(path, info.isDir() ? QStringLiteral("it is a folder")
+                                              : QStringLiteral("it is not a regular file")),
+                {}};
+    }
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly)) return {CannotOpen(path, file.errorString()), {}};
     // Nothing after the longest possible setup file can matter.

@@ -13,6 +13,17 @@ QString Place(int block, int slot) {
         .arg(slot);
 }
 
+// A value goes in UTF-8 when that fits. A longer one, such as a value read from a Windows file,
+// goes back in Windows-1252 when that fits and reads back as the same text; else nothing fits.
+std::optional<QByteArray> EncodeValue(const QString& value) {
+    QByteArray utf8 = EncodeAnsiText(value);
+    if (utf8.size() <= kLongestSetupValue) return utf8;
+    std::optional<QByteArray> windows = EncodeWindows1252(value);
+    if (windows && windows->size() <= kLongestSetupValue && DecodeAnsiText(*windows) == value)
+        return windows;
+    return std::nullopt;
+}
+
 DecodedSetupFile Broken(const QString& problem) {
     return DecodedSetupFile{std::nullopt, problem};
 }
@@ -25,20 +36,20 @@ EncodedSetupFile EncodeSetupFile(const NoteSlotTable& table) {
     for (int block = 0; block < int(kSetupFileBlocks.size()); ++block) {
         const auto field = kSetupFileBlocks[block].field;
         for (int slot = 0; slot < kSlotCount; ++slot) {
-            const QByteArray text = EncodeAnsiText(table[slot].*field);
-            if (text.size() > kLongestSetupValue) {
+            const std::optional<QByteArray> text = EncodeValue(table[slot].*field);
+            if (!text) {
                 // A wrapped count would make the rest of the file unreadable.
                 return EncodedSetupFile{
                     {},
                     QStringLiteral("the value in %1 is %2 bytes long, more than the %3 a "
                                    "setup file can hold")
                         .arg(Place(block, slot))
-                        .arg(text.size())
+                        .arg(EncodeAnsiText(table[slot].*field).size())
                         .arg(kLongestSetupValue)};
             }
             char count[2];
-            qToLittleEndian<qint16>(qint16(text.size()), count);
-            result.bytes.append(count, 2).append(text);
+            qToLittleEndian<qint16>(qint16(text->size()), count);
+            result.bytes.append(count, 2).append(*text);
         }
     }
     return result;

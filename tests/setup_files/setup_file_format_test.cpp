@@ -65,9 +65,12 @@ TEST(SetupFileFormat, ValuesUpTo32767BytesFit) {
     ASSERT_TRUE(decoded.table);
     EXPECT_EQ((*decoded.table)[60].WaveFileName, table[60].WaveFileName);
 
-    // Only 16384 characters, but 32768 bytes.
-    table[60].WaveFileName = QString(16384, u'é');
-    EXPECT_FALSE(EncodeSetupFile(table).problem.isEmpty());
+    // 16384 characters, 32768 bytes, none in Windows-1252; and a text whose Windows-1252 bytes
+    // would read back as other text in UTF-8.
+    for (const QString& tooLong : {QString(16384, u'ā'), QStringLiteral("Ã©").repeated(12000)}) {
+        table[60].WaveFileName = tooLong;
+        EXPECT_FALSE(EncodeSetupFile(table).problem.isEmpty());
+    }
 }
 
 }  // namespace

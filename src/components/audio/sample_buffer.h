@@ -50,10 +50,17 @@ struct SampleBuffer {
     QString path;
 };
 
+// The most samples a decoded sound may hold: 1 GiB of floats, some 46 minutes of stereo at 48 kHz.
+// A longer file is refused rather than left to exhaust the memory.
+inline constexpr std::int64_t kMostSoundSamples =
+    (std::int64_t{1} << 30) / std::int64_t{sizeof(float)};
+
 struct LoadedSamples {
     std::shared_ptr<const SampleBuffer> buffer;
-    QString error;  // why it could not be loaded, when buffer is null
+    QString error;  // why it could not be loaded, naming the file, when buffer is null
 };
 
-// Decodes WAV, AIFF, FLAC, Ogg and MP3 with libsndfile. Runs on the calling thread.
+// Decodes WAV, AIFF, FLAC, Ogg and MP3 with libsndfile. Runs on the calling thread. A file
+// without a single frame, one longer than kMostSoundSamples and one that does not fit in the
+// memory left are refused.
 LoadedSamples LoadSampleFile(const QString& path);

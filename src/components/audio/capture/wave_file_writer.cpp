@@ -12,8 +12,9 @@
 namespace {
 
 constexpr int kBlockFrames = 8192;
-// How often the header and the data reach the disk.
-constexpr auto kDurableInterval = std::chrono::milliseconds(500);
+// How often the header and the data reach the disk. A killed recording loses what came after:
+// this interval, the poll and the frames still queued stay well within half a second.
+constexpr auto kDurableInterval = std::chrono::milliseconds(250);
 // The queue holds seconds; looking at it a hundred times a second keeps it nearly empty.
 constexpr auto kPollInterval = std::chrono::milliseconds(10);
 

@@ -13,8 +13,8 @@
 struct sf_private_tag;
 
 // Writes a take as a 16-bit PCM wave file on a thread of its own, draining the capture queue.
-// Twice a second it brings the header up to date and flushes the file to the disk, so that a
-// crash or a power cut leaves a playable file that lacks at most the last second.
+// Four times a second it brings the header up to date and flushes the file to the disk, so that
+// a crash or a power cut leaves a playable file that lacks at most the last half second.
 class WaveFileWriter {
   public:
     using FailureHandler = std::function<void(const QString& reason)>;
