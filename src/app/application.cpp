@@ -89,8 +89,9 @@ Application::Application(Backends backends, QObject* parent)
 
     auto showStatus = [this](const QString& text) { window_->ShowStatus(text); };
     auto showKey = [this](int note, bool pressed) { window_->ShowKey(note, pressed); };
+    auto showMidiStatus = [this](const QString& text) { window_->ShowMidiStatus(text); };
     midiSetup_ = std::make_unique<MidiSetup>(context_, *backends_.midiIn, *backends_.midiOut,
-                                             showStatus, showKey);
+                                             showMidiStatus, showKey);
     pump_ = std::make_unique<MidiInputPump>(*backends_.midiIn, *dispatcher_, showKey);
 
     ComputerKeyboard::Commands commands;
@@ -126,7 +127,7 @@ void Application::WireFileMenu() {
     };
     fileWindow.close = [this] { window_->close(); };
     fileCommands_ =
-        std::make_unique<FileCommands>(context_, backends_.padChannels(), *names_, *midiSetup_,
+        std::make_unique<FileCommands>(context_, backends_.padChannels(), *names_, *pump_,
                                        *backends_.prompts, *backends_.settings, fileWindow);
     connect(window_.get(), &MainWindow::newRequested, this, [this] { fileCommands_->New(); });
     connect(window_.get(), &MainWindow::openRequested, this, [this] { fileCommands_->Open(); });

@@ -1,5 +1,6 @@
 #include "about/about_box.h"
 #include "app/application.h"
+#include "components/audio/alsa_silence.h"
 #include "components/widgets/dark_theme.h"
 
 #include <QApplication>
@@ -7,6 +8,7 @@
 int main(int argc, char** argv) {
     // Probing for a JACK server must never start one.
     qputenv("JACK_NO_START_SERVER", "1");
+    SilenceAlsaLibErrors();
     QApplication app(argc, argv);
     QApplication::setApplicationName(QStringLiteral("Orvelle Quindara"));
     QApplication::setWindowIcon(AboutBox::ProgramIcon());

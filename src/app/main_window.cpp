@@ -1,5 +1,6 @@
 #include "app/main_window.h"
 
+#include "app/key_release_filter.h"
 #include "app/pad_strip.h"
 #include "components/audio/wave_channel.h"
 #include "components/widgets/fader.h"
@@ -17,6 +18,7 @@
 #include <QApplication>
 #include <QCloseEvent>
 #include <QGroupBox>
+#include <QGuiApplication>
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QLabel>
@@ -54,6 +56,9 @@ MainWindow::MainWindow(QWidget* parent) : QMainWindow(parent) {
     setCentralWidget(central);
 
     statusBar()->setObjectName(QStringLiteral("InfoStatusBar"));
+    midiStatus_ = new QLabel(this);
+    midiStatus_->setContentsMargins(0, 0, fontMetrics().averageCharWidth() * 2, 0);
+    statusBar()->addPermanentWidget(midiStatus_);
     deviceSummary_ = new QLabel(this);
     statusBar()->addPermanentWidget(deviceSummary_);
 
@@ -250,6 +255,9 @@ void MainWindow::Attach(Context& context, PadControls& pads, GlobalMidiCommands&
     pads_ = &pads;
     globalCommands_ = &globalCommands;
     keyboard_ = &keyboard;
+    keyFilter_ = std::make_unique<KeyReleaseFilter>(
+        keyboard,
+        !EnableDetectableAutoRepeat() && QGuiApplication::platformName() == QLatin1String("xcb"));
     channels_ = &channels;
     ConnectPads();
 
@@ -317,6 +325,7 @@ void MainWindow::UpdateUserControls() {
         strip->switchLoopOption->setPosition(view.loopPosition);
         strip->ModeSelector->setPosition(view.modePosition);
         strip->ShowFunction(view.modePosition != 0);
+        strip->ShowWaveFile(context_->NoteSlots[strip->note()].WaveFileName);
     }
 }
 
@@ -381,6 +390,14 @@ QString MainWindow::DeviceSummary() const {
     return deviceSummary_->text();
 }
 
+void MainWindow::ShowMidiStatus(const QString& text) {
+    midiStatus_->setText(text);
+}
+
+QString MainWindow::MidiStatus() const {
+    return midiStatus_->text();
+}
+
 void MainWindow::ShowKey(int note, bool pressed) {
     if (PianoKey* k = key(note)) k->setPressed(pressed);
 }
@@ -418,6 +435,8 @@ void MainWindow::RefreshMeters() {
 
 bool MainWindow::eventFilter(QObject* watched, QEvent* event) {
     if (watched == padArea_ && event->type() == QEvent::Resize) PlaceTransposeBar();
+    // A modal window (a message box, a file dialog) takes the keys and the mouse from here on.
+    if (watched == this && event->type() == QEvent::WindowBlocked) ReleaseHeldInput();
     const bool isKey = event->type() == QEvent::KeyPress || event->type() == QEvent::KeyRelease;
     if (!isKey || !keyboard_) return QMainWindow::eventFilter(watched, event);
     // Only keys meant for this window or its children; a key is delivered to each widget up the
@@ -431,14 +450,28 @@ bool MainWindow::eventFilter(QObject* watched, QEvent* event) {
     const auto* keyEvent = static_cast<QKeyEvent*>(event);
     if (!ComputerKeyboard::Handles(VirtualKeyCode(*keyEvent)))
         return QMainWindow::eventFilter(watched, event);
-    FeedKeyEvent(*keyboard_, *keyEvent);
+    keyFilter_->Feed(*keyEvent);
     return true;
 }
 
 void MainWindow::changeEvent(QEvent* event) {
-    // Coming back to the main window (from the note picker, say) hides the note marker.
-    if (event->type() == QEvent::ActivationChange && isActiveWindow()) HideNoteMarker();
+    if (event->type() == QEvent::ActivationChange) {
+        // Coming back to the main window (from the note picker, say) hides the note marker;
+        // leaving it (Alt+Tab, another workspace) means its key releases will go elsewhere.
+        if (isActiveWindow()) {
+            HideNoteMarker();
+        } else {
+            ReleaseHeldInput();
+        }
+    }
     QMainWindow::changeEvent(event);
+}
+
+void MainWindow::ReleaseHeldInput() {
+    if (!keyboard_) return;
+    keyFilter_->Flush();
+    keyboard_->ReleaseAll();
+    for (PianoKey* key : keys_) key->endMouseHold();
 }
 
 void MainWindow::closeEvent(QCloseEvent* event) {

@@ -5,8 +5,10 @@
 
 #include <array>
 #include <functional>
+#include <memory>
 
 class ComputerKeyboard;
+class KeyReleaseFilter;
 class GlobalMidiCommands;
 class PadControls;
 class PadStrip;
@@ -50,6 +52,9 @@ class MainWindow : public QMainWindow {
     // The sound device at the right end of the status bar: "JACK 48 kHz 5.3 ms".
     void ShowDeviceSummary(const QString& text);
     QString DeviceSummary() const;
+    // The MIDI ports' notices, beside the sound device, so neither hides the other.
+    void ShowMidiStatus(const QString& text);
+    QString MidiStatus() const;
     void ShowKey(int note, bool pressed);
     bool KeyShownPressed(int note) const;
     // The note marker sits on one key of the on-screen keyboard.
@@ -107,11 +112,14 @@ class MainWindow : public QMainWindow {
     void HideMidiInfoLabels();
     void RefreshMeters();
     void PlaceTransposeBar();
+    // The window stops seeing keys and the mouse: every held note ends as its release would.
+    void ReleaseHeldInput();
 
     Context* context_ = nullptr;
     PadControls* pads_ = nullptr;
     GlobalMidiCommands* globalCommands_ = nullptr;
     ComputerKeyboard* keyboard_ = nullptr;
+    std::unique_ptr<KeyReleaseFilter> keyFilter_;
     WaveChannels* channels_ = nullptr;
 
     std::array<PadStrip*, 16> padStrips_{};
@@ -119,6 +127,7 @@ class MainWindow : public QMainWindow {
     QWidget* padArea_ = nullptr;
     QLabel* PanelTranspose = nullptr;
     QLabel* deviceSummary_ = nullptr;
+    QLabel* midiStatus_ = nullptr;
     QTimer timerHideMidiParamsLabels;
     QTimer timerHideTransposeInfoBar;
     QTimer meterTimer_;

@@ -7,6 +7,7 @@
 #include "components/widgets/rotary_knob.h"
 #include "engine/pad_controls.h"
 
+#include <QFileInfo>
 #include <QGridLayout>
 #include <QLabel>
 #include <QPushButton>
@@ -31,7 +32,46 @@ QString FrequencyText(int hertz) {
                       : QStringLiteral("Frequency: %1 Hz").arg(hertz);
 }
 
+QFont SmallFont(const QWidget& widget) {
+    QFont small = widget.font();
+    small.setPointSizeF(small.pointSizeF() * 0.8);
+    return small;
+}
+
+// The short name a control carries in sight, besides its tool tip.
+QLabel* Caption(const QString& text, QWidget* parent) {
+    auto* caption = new QLabel(text, parent);
+    caption->setAlignment(Qt::AlignCenter);
+    caption->setFont(SmallFont(*parent));
+    return caption;
+}
+
 }  // namespace
+
+// Shows its text whole when there is room, else elided in the middle, where a file name keeps
+// both its start and its extension. It never widens its column.
+class MiddleElidedLabel : public QLabel {
+  public:
+    explicit MiddleElidedLabel(QWidget* parent) : QLabel(parent) {
+        setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
+        setAlignment(Qt::AlignCenter);
+    }
+    void setFullText(const QString& text) {
+        fullText_ = text;
+        Elide();
+    }
+
+  protected:
+    void resizeEvent(QResizeEvent* event) override {
+        QLabel::resizeEvent(event);
+        Elide();
+    }
+
+  private:
+    void Elide() { setText(fontMetrics().elidedText(fullText_, Qt::ElideMiddle, width())); }
+
+    QString fullText_;
+};
 
 PadStrip::PadStrip(int note, const QString& title, QWidget* parent) : QWidget(parent), note_(note) {
     setObjectName(QStringLiteral("frameWave%1").arg(note));
@@ -57,6 +97,7 @@ PadStrip::PadStrip(int note, const QString& title, QWidget* parent) : QWidget(pa
     functionArea_ = new QStackedWidget(this);
     functionArea_->addWidget(ModeSelector);
     functionArea_->addWidget(lblDisplayMidiParameter);
+    layout->addWidget(Caption(QStringLiteral("MIDI / Wave"), this));
     layout->addWidget(functionArea_);
 
     switchLoopOption = new LeverSwitch(4, this);
@@ -65,6 +106,7 @@ PadStrip::PadStrip(int note, const QString& title, QWidget* parent) : QWidget(pa
     for (int position = 0; position < 4; ++position)
         tips << PadControls::LoopOptionToolTip(position);
     switchLoopOption->setPositionToolTips(tips);
+    layout->addWidget(Caption(QStringLiteral("Loop"), this));
     layout->addWidget(switchLoopOption, 0, Qt::AlignHCenter);
 
     knobPan = new RotaryKnob(this);
@@ -72,10 +114,12 @@ PadStrip::PadStrip(int note, const QString& title, QWidget* parent) : QWidget(pa
     knobPan->setRange(-10000, 10000);
     knobPan->setDefaultValue(0);
     knobPan->setValueText(PanText);
+    layout->addWidget(Caption(QStringLiteral("Pan"), this));
     layout->addWidget(knobPan, 0, Qt::AlignHCenter);
 
-    auto* levels = new QHBoxLayout;
-    levels->setSpacing(2);
+    auto* levels = new QGridLayout;
+    levels->setHorizontalSpacing(2);
+    levels->setVerticalSpacing(0);
     sliderVolume = new Fader(this);
     sliderVolume->setObjectName(QStringLiteral("sliderVolume%1").arg(note));
     sliderVolume->setRange(-10000, 0);
@@ -92,18 +136,25 @@ PadStrip::PadStrip(int note, const QString& title, QWidget* parent) : QWidget(pa
     const int meterWidth = std::max(6, fontMetrics().height() / 2);
     Level_Left->setFixedWidth(meterWidth);
     Level_Right->setFixedWidth(meterWidth);
-    levels->addWidget(sliderVolume);
-    levels->addWidget(Level_Left);
-    levels->addWidget(Level_Right);
-    levels->addWidget(sliderFrequency);
+    levels->addWidget(sliderVolume, 0, 0);
+    levels->addWidget(Level_Left, 0, 1);
+    levels->addWidget(Level_Right, 0, 2);
+    levels->addWidget(sliderFrequency, 0, 3);
+    levels->addWidget(Caption(QStringLiteral("Vol"), this), 1, 0);
+    levels->addWidget(Caption(QStringLiteral("Rate"), this), 1, 3);
+    levels->setRowStretch(0, 1);
     layout->addLayout(levels, 1);
+
+    waveFile_ = new MiddleElidedLabel(this);
+    waveFile_->setObjectName(QStringLiteral("lblWaveFile%1").arg(note));
+    waveFile_->setFont(SmallFont(*this));
+    waveFile_->setMinimumHeight(waveFile_->fontMetrics().height());  // a MIDI pad keeps the line
+    layout->addWidget(waveFile_);
 
     cmdSelectWaveFile = new QPushButton(QStringLiteral("Select Wave File"), this);
     cmdSelectWaveFile->setObjectName(QStringLiteral("cmdSelectWaveFile%1").arg(note));
     cmdSelectWaveFile->setEnabled(false);  // wave files are chosen once the recorder can save them
-    QFont small = cmdSelectWaveFile->font();
-    small.setPointSizeF(small.pointSizeF() * 0.8);
-    cmdSelectWaveFile->setFont(small);
+    cmdSelectWaveFile->setFont(SmallFont(*this));
     layout->addWidget(cmdSelectWaveFile);
 
     ShowFunction(false);
@@ -118,7 +169,20 @@ bool PadStrip::InfoLabelShown() const {
     return functionArea_->currentWidget() == lblDisplayMidiParameter;
 }
 
+void PadStrip::ShowWaveFile(const QString& path) {
+    wavePath_ = path;
+    ShowWaveFileName();
+}
+
+void PadStrip::ShowWaveFileName() {
+    const QString path = wave_ ? wavePath_ : QString();
+    waveFile_->setFullText(QFileInfo(path).fileName());
+    waveFile_->setToolTip(path);
+}
+
 void PadStrip::ShowFunction(bool wave) {
+    wave_ = wave;
+    ShowWaveFileName();
     const QColor accent = wave ? WaveAccent() : MidiAccent();
     // The whole column takes the colour of what the pad does, visible from across the room.
     ModeSelector->setAccentColor(accent);

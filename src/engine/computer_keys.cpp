@@ -78,11 +78,24 @@ void ComputerKeyboard::KeyDown(int keyCode) {
 void ComputerKeyboard::KeyUp(int keyCode) {
     if (keyCode == kCtrl) ctrlKeyDown_ = false;
     if (!InCommandRange(keyCode)) return;
-    // Released even while Ctrl is held, so no note is left hanging.
+    // Released even while Ctrl is held, so no note is left hanging; but only a key that played
+    // sends a note-off (the N of Ctrl+N never did).
     const int note = PadNoteForKey(keyCode);
     if (note < 0) return;
-    context_.QwertyKeyState[note - kFirstPad] = 0;
+    int& held = context_.QwertyKeyState[note - kFirstPad];
+    if (held != 1) return;
+    held = 0;
     QwertyKeyUp(note);
+}
+
+void ComputerKeyboard::ReleaseAll() {
+    ctrlKeyDown_ = false;
+    for (int note = kFirstPad; note <= kLastPad; ++note) {
+        int& held = context_.QwertyKeyState[note - kFirstPad];
+        if (held != 1) continue;
+        held = 0;
+        QwertyKeyUp(note);
+    }
 }
 
 void ComputerKeyboard::QwertyKeyDown(int note) {

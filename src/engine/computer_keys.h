@@ -44,6 +44,10 @@ class ComputerKeyboard {
 
     bool CtrlKeyDown() const { return ctrlKeyDown_; }
 
+    // The window no longer sees the keys (it lost the focus, or a modal window opened): forget
+    // Ctrl and end every held note key as its release would, since that release will go elsewhere.
+    void ReleaseAll();
+
   private:
     static void Run(const std::function<void()>& command) {
         if (command) command();

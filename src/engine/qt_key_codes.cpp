@@ -1,7 +1,5 @@
 #include "engine/qt_key_codes.h"
 
-#include "engine/computer_keys.h"
-
 #include <QKeyEvent>
 
 namespace {
@@ -138,16 +136,4 @@ int VirtualKeyCode(const QKeyEvent& event) {
         if (const int code = KeypadCode(key)) return code;
     }
     return MainKeyCode(key);
-}
-
-bool FeedKeyEvent(ComputerKeyboard& keyboard, const QKeyEvent& event) {
-    if (event.type() == QEvent::KeyPress) {
-        keyboard.KeyDown(VirtualKeyCode(event));
-        return true;
-    }
-    if (event.type() == QEvent::KeyRelease) {
-        if (!event.isAutoRepeat()) keyboard.KeyUp(VirtualKeyCode(event));
-        return true;
-    }
-    return false;
 }

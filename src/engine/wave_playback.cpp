@@ -2,7 +2,6 @@
 
 #include "components/audio/wave_channel.h"
 #include "components/prompts/prompts.h"
-#include "engine/note_slots.h"
 #include "engine/text_values.h"
 
 WavePlayback::WavePlayback(Context& context, WaveChannels& channels, Prompts& prompts,
@@ -26,9 +25,27 @@ void WavePlayback::PlayWave(int note) {
         // Nothing sounds, so the pad must not look as if it did: a once-only pad would otherwise
         // never try again, even after its file is back.
         slot.WavePlaying = BooleanText(false);
-        prompts_.message(
-            Notice(QStringLiteral("Problem playing specified audio file"), PromptIcon::Critical));
+        ReportFailure(note);
     }
+}
+
+void WavePlayback::ReportFailure(int note) {
+    bool& reported = failureReported_[note - kFirstPad];
+    if (reported) return;
+    reported = true;
+    const NoteSlot& slot = context_.NoteSlots[note];
+    QString text = QStringLiteral("Problem playing specified audio file\n\nPad note %1: %2")
+                       .arg(note)
+                       .arg(slot.WaveFileName);
+    const QString reason = channels_.channel(note).lastError();
+    if (!reason.isEmpty()) text += u'\n' + reason;
+    QMetaObject::invokeMethod(
+        this,
+        [this, note, text] {
+            prompts_.message(Notice(text, PromptIcon::Critical));
+            failureReported_[note - kFirstPad] = false;
+        },
+        Qt::QueuedConnection);
 }
 
 // Hands the slot's settings to the channel in their fixed order and starts it; false as soon as a

@@ -1,6 +1,10 @@
 #pragma once
 
+#include "engine/note_slots.h"
+
 #include <QObject>
+
+#include <array>
 
 class Prompts;
 class WaveChannels;
@@ -15,7 +19,10 @@ class WavePlayback : public QObject {
                  QObject* parent = nullptr);
 
     // Starts the pad's wave, or stops it when its channel already sounds. Does nothing for a slot
-    // without an assigned wave. A failure is reported and leaves the pad silent and not playing.
+    // without an assigned wave. A failure leaves the pad silent and not playing, and is reported
+    // in a message box once the current event is done, so a note being dispatched (one of a
+    // burst from MIDI In, say) never waits for the box; while a pad's box is up, that pad's
+    // further failures add no second box.
     void PlayWave(int note);
     // Stops the pad's wave if its channel sounds; a silent channel changes nothing.
     void StopWave(int note);
@@ -24,8 +31,10 @@ class WavePlayback : public QObject {
   private:
     void OnPlaybackEnded(int note);
     bool StartChannel(int note);
+    void ReportFailure(int note);
 
     Context& context_;
     WaveChannels& channels_;
     Prompts& prompts_;
+    std::array<bool, kPadCount> failureReported_{};
 };

@@ -31,6 +31,14 @@ MidiSetup::MidiSetup(Context& context, MidiInputPort& midiIn, MidiOutputPort& mi
       showStatus_(std::move(showStatus)),
       showKey_(std::move(showKey)) {}
 
+void MidiSetup::UseMidiSystem(MidiSystem system) {
+    system_ = system;
+    CloseMidiInPort();
+    CloseMidiOutPort();
+    midiIn_.setMidiSystem(system);
+    midiOut_.setMidiSystem(system);
+}
+
 void MidiSetup::CheckMidiDevices() {
     context_.MidiInAvailable = midiIn_.deviceCount() > 0;
     context_.MidiOutAvailable = midiOut_.deviceCount() > 0;
@@ -47,7 +55,11 @@ void MidiSetup::OpenMidiInPort() {
         return;
     }
     if (midiIn_.isOpen()) midiIn_.close();
-    if (!midiIn_.open(context_.MidiInDevice)) ShowStatus(kNoMidiInText);
+    if (midiIn_.open(context_.MidiInDevice)) {
+        TakeBackStatus(kNoMidiInText);
+    } else {
+        ShowStatus(kNoMidiInText);
+    }
 }
 
 void MidiSetup::OpenMidiOutPort() {
@@ -56,7 +68,11 @@ void MidiSetup::OpenMidiOutPort() {
         return;
     }
     if (midiOut_.isOpen() || midiOut_.deviceIndex() == -1) midiOut_.close();
-    if (!midiOut_.open(context_.MidiOutDevice)) ShowStatus(kNoMidiOutText);
+    if (midiOut_.open(context_.MidiOutDevice)) {
+        TakeBackStatus(kNoMidiOutText);
+    } else {
+        ShowStatus(kNoMidiOutText);
+    }
 }
 
 void MidiSetup::CloseMidiInPort() {
@@ -92,5 +108,11 @@ void MidiSetup::Send(int status, int data1, int data2) {
 }
 
 void MidiSetup::ShowStatus(const QString& text) {
+    shownStatus_ = text;
     if (showStatus_) showStatus_(text);
+}
+
+// The notice stays in the status bar: once its port opens it would tell the user something false.
+void MidiSetup::TakeBackStatus(const QString& notice) {
+    if (shownStatus_ == notice) ShowStatus(QString());
 }

@@ -1,5 +1,6 @@
 #include "midi/midi_setup_dialog.h"
 
+#include "components/widgets/device_name_list.h"
 #include "components/widgets/dialog_controls.h"
 
 #include <QComboBox>
@@ -8,6 +9,7 @@
 #include <QPushButton>
 #include <QScreen>
 #include <QShowEvent>
+#include <QSignalBlocker>
 #include <QVBoxLayout>
 
 namespace {
@@ -39,7 +41,7 @@ QLabel* Caption(const QString& text, const QString& name, QWidget* buddy) {
 
 void Fill(QComboBox* list, const QStringList& names, int selection) {
     list->clear();
-    list->addItems(names);
+    for (const QString& name : names) AddDeviceName(list, name);
     list->setCurrentIndex(selection);
 }
 
@@ -52,6 +54,14 @@ MidiSetupDialog::MidiSetupDialog(Context& context, MidiSetup& midiSetup, Setting
     setWindowTitle(QStringLiteral("MIDI Setup"));
     setModal(true);
 
+    comboSystem_ =
+        MakeDropDownList(QStringLiteral("ComboMIDISystem"),
+                         QStringLiteral("The MIDI system the devices are found on"), this);
+    for (MidiSystem system : kMidiSystemChoices) {
+        comboSystem_->addItem(MidiSystemChoiceName(system), static_cast<int>(system));
+    }
+    lblSystemNote_ = new QLabel(this);
+    lblSystemNote_->setObjectName(QStringLiteral("lblMIDISystemNote"));
     comboMidiOut_ = MakeDropDownList(QStringLiteral("ComboMIDIOUT"),
                                      QStringLiteral("The device that plays the MIDI slots"), this);
     comboMidiIn_ =
@@ -68,16 +78,24 @@ MidiSetupDialog::MidiSetupDialog(Context& context, MidiSetup& midiSetup, Setting
     auto* cmdCancel = MakeDialogButton(QStringLiteral("Cancel"), QStringLiteral("cmdCancel"),
                                        QStringLiteral("Leave the devices as they were"), this);
 
+    auto* system = new QHBoxLayout;
+    system->addWidget(comboSystem_);
+    system->addWidget(lblSystemNote_);
+    system->addStretch();
     auto* choices = new QGridLayout;
     choices->addWidget(
-        Caption(QStringLiteral("MIDI Out Driver"), QStringLiteral("lblMIDIOUT"), comboMidiOut_), 0,
+        Caption(QStringLiteral("MIDI System"), QStringLiteral("lblMIDISystem"), comboSystem_), 0,
         0);
-    choices->addWidget(comboMidiOut_, 1, 0);
-    choices->addWidget(cmdTestMidi, 1, 1);
+    choices->addLayout(system, 1, 0, 1, 2);
     choices->addWidget(
-        Caption(QStringLiteral("MIDI In Driver"), QStringLiteral("lblMIDIIN"), comboMidiIn_), 2, 0);
-    choices->addWidget(comboMidiIn_, 3, 0);
-    choices->addWidget(cmdMoreInfo, 3, 1);
+        Caption(QStringLiteral("MIDI Out Driver"), QStringLiteral("lblMIDIOUT"), comboMidiOut_), 2,
+        0);
+    choices->addWidget(comboMidiOut_, 3, 0);
+    choices->addWidget(cmdTestMidi, 3, 1);
+    choices->addWidget(
+        Caption(QStringLiteral("MIDI In Driver"), QStringLiteral("lblMIDIIN"), comboMidiIn_), 4, 0);
+    choices->addWidget(comboMidiIn_, 5, 0);
+    choices->addWidget(cmdMoreInfo, 5, 1);
     choices->setColumnStretch(0, 1);
 
     auto* buttons = new QHBoxLayout;
@@ -97,6 +115,10 @@ MidiSetupDialog::MidiSetupDialog(Context& context, MidiSetup& midiSetup, Setting
             [this] { session_.StartTestNote(comboMidiOut_->currentIndex()); });
     connect(cmdTestMidi, &QPushButton::released, this, [this] {
         if (session_.testNoteSounding()) session_.EndTestNote();
+    });
+    connect(comboSystem_, &QComboBox::currentIndexChanged, this, [this] {
+        const auto system = static_cast<MidiSystem>(comboSystem_->currentData().toInt());
+        ShowLists(session_.ChangeSystem(system));
     });
     connect(cmdMoreInfo, &QPushButton::clicked, this, &MidiSetupDialog::ShowMoreInfo);
     connect(cmdOK, &QPushButton::clicked, this, &MidiSetupDialog::accept);
@@ -125,16 +147,27 @@ QWidget* MidiSetupDialog::MakeInfo() {
 }
 
 void MidiSetupDialog::Load() {
-    const MidiDeviceLists lists = session_.Load();
+    {
+        const QSignalBlocker quiet(comboSystem_);
+        comboSystem_->setCurrentIndex(
+            comboSystem_->findData(static_cast<int>(session_.midiSystem())));
+    }
+    ShowLists(session_.Load());
+    loadWhenShown_ = false;
+}
+
+void MidiSetupDialog::ShowLists(const MidiDeviceLists& lists) {
     Fill(comboMidiIn_, lists.inNames, lists.inSelection);
     Fill(comboMidiOut_, lists.outNames, lists.outSelection);
-    loadWhenShown_ = false;
+    const QString note = MidiSystemNote(session_.midiSystem());
+    lblSystemNote_->setText(note);
+    lblSystemNote_->setVisible(!note.isEmpty());
 }
 
 void MidiSetupDialog::showEvent(QShowEvent* event) {
     if (!event->spontaneous()) {
         if (loadWhenShown_) Load();
-        session_.RememberOutputPort();
+        session_.RememberPorts();
         CentreOnScreen();
     }
     QDialog::showEvent(event);
@@ -153,13 +186,14 @@ void MidiSetupDialog::ShowMoreInfo() {
 }
 
 void MidiSetupDialog::accept() {
-    session_.Accept(comboMidiIn_->currentIndex(), comboMidiIn_->currentText(),
-                    comboMidiOut_->currentIndex(), comboMidiOut_->currentText());
+    session_.Accept(comboMidiIn_->currentIndex(), comboMidiIn_->currentData().toString(),
+                    comboMidiOut_->currentIndex(), comboMidiOut_->currentData().toString());
     QDialog::accept();
 }
 
 void MidiSetupDialog::reject() {
     session_.Cancel();
     loadWhenShown_ = true;
+    info_->hide();
     QDialog::reject();
 }

@@ -23,6 +23,20 @@ int Selection(const QStringList& names, int device) {
     return device >= 0 && device < names.size() ? device : 0;
 }
 
+// By name: a JACK port list renumbers itself when other programs come and go.
+template <class Port>
+QString OpenDeviceName(const Port& port) {
+    return port.isOpen() ? port.deviceNames().value(port.deviceIndex()) : QString();
+}
+
+template <class Port>
+void OpenAgain(Port& port, const QString& deviceName) {
+    if (deviceName.isEmpty()) return;
+    const int device = static_cast<int>(port.deviceNames().indexOf(deviceName));
+    if (device < 0 || (port.isOpen() && port.deviceIndex() == device)) return;
+    port.open(device);
+}
+
 }  // namespace
 
 MidiDeviceLists FillMidiDeviceLists(MidiSetup& midiSetup, Context& context) {
@@ -47,10 +61,20 @@ MidiDeviceLists MidiSetupSession::Load() {
     return FillMidiDeviceLists(midiSetup_, context_);
 }
 
-void MidiSetupSession::RememberOutputPort() {
-    const MidiOutputPort& port = midiSetup_.midiOut();
-    // By name: a JACK port list renumbers itself when other programs come and go.
-    outDeviceBefore_ = port.isOpen() ? port.deviceNames().value(port.deviceIndex()) : QString();
+void MidiSetupSession::RememberPorts() {
+    systemBefore_ = midiSetup_.midiSystem();
+    inDeviceBefore_ = OpenDeviceName(midiSetup_.midiIn());
+    outDeviceBefore_ = OpenDeviceName(midiSetup_.midiOut());
+}
+
+MidiSystem MidiSetupSession::midiSystem() const {
+    return midiSetup_.midiSystem();
+}
+
+MidiDeviceLists MidiSetupSession::ChangeSystem(MidiSystem system) {
+    if (testNoteSounding_) EndTestNote();
+    midiSetup_.UseMidiSystem(system);
+    return Load();
 }
 
 void MidiSetupSession::StartTestNote(int outPosition) {
@@ -80,15 +104,17 @@ void MidiSetupSession::Accept(int inPosition, const QString& inName, int outPosi
     settings_.setValue(kMidiSection, QStringLiteral("MIDI_InputName"), inName);
     settings_.setValue(kMidiSection, QStringLiteral("MIDI_Error_Check"),
                        NumberText(context_.MidiDeviceNamesLength));
+    settings_.setValue(kMidiSection, kMidiSystemKey, MidiSystemText(midiSetup_.midiSystem()));
     midiSetup_.OpenMidiInPort();
     midiSetup_.OpenMidiOutPort();
 }
 
 void MidiSetupSession::Cancel() {
     if (testNoteSounding_) EndTestNote();
-    if (outDeviceBefore_.isEmpty()) return;
-    MidiOutputPort& port = midiSetup_.midiOut();
-    const int device = static_cast<int>(port.deviceNames().indexOf(outDeviceBefore_));
-    if (device < 0 || (port.isOpen() && port.deviceIndex() == device)) return;
-    port.open(device);
+    if (midiSetup_.midiSystem() != systemBefore_) {
+        midiSetup_.UseMidiSystem(systemBefore_);
+        midiSetup_.CheckMidiDevices();
+        OpenAgain(midiSetup_.midiIn(), inDeviceBefore_);
+    }
+    OpenAgain(midiSetup_.midiOut(), outDeviceBefore_);
 }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "components/midi/midi_system.h"
+
 #include <QString>
 #include <QStringList>
 
@@ -22,7 +24,7 @@ struct MidiDeviceLists {
 MidiDeviceLists FillMidiDeviceLists(MidiSetup& midiSetup, Context& context);
 
 // The work behind the MIDI setup dialog, from its loading to OK or Cancel, on the program's own
-// ports. It keeps only what Cancel needs to undo a test note.
+// ports. It keeps only what Cancel needs to undo a test note or a change of MIDI system.
 class MidiSetupSession {
   public:
     MidiSetupSession(Context& context, MidiSetup& midiSetup, SettingsStore& settings);
@@ -33,8 +35,11 @@ class MidiSetupSession {
 
     // CheckMidiDevices, then FillMidiDeviceLists.
     MidiDeviceLists Load();
-    // Notes the device the Out port is open on now; Cancel returns the port to it.
-    void RememberOutputPort();
+    // Notes the MIDI system and the devices the ports are open on now; Cancel returns to them.
+    void RememberPorts();
+    // Another MIDI system chosen: both ports move to it, closed, and its devices are listed.
+    MidiDeviceLists ChangeSystem(MidiSystem system);
+    MidiSystem midiSystem() const;
 
     // Test MIDI Out pressed: middle C at velocity 100 on channel 1 of the Out device at
     // `outPosition`. Released: the note's end, and the port closed.
@@ -42,17 +47,19 @@ class MidiSetupSession {
     void EndTestNote();
     bool testNoteSounding() const { return testNoteSounding_; }
 
-    // OK: the list positions (-1 for an empty list) and their names are stored and both ports
-    // opened on them.
+    // OK: the list positions (-1 for an empty list), their names and the MIDI system are stored
+    // and both ports opened on them.
     void Accept(int inPosition, const QString& inName, int outPosition, const QString& outName);
-    // Cancel stores nothing; the Out port goes back to the device remembered, as a test note
-    // would otherwise leave every MIDI slot silent.
+    // Cancel stores nothing; the ports go back to the system and devices remembered, as a test
+    // note or another system would otherwise leave every MIDI slot silent.
     void Cancel();
 
   private:
     Context& context_;
     MidiSetup& midiSetup_;
     SettingsStore& settings_;
-    QString outDeviceBefore_;  // "" when the Out port was closed
+    MidiSystem systemBefore_ = MidiSystem::Automatic;
+    QString inDeviceBefore_;  // "" when the In port was closed
+    QString outDeviceBefore_;
     bool testNoteSounding_ = false;
 };

@@ -19,6 +19,8 @@ int StoredNumber(const SettingsStore& settings, const QString& key) {
 StartupMidiOutcome RunStartupMidiCheck(MidiSetup& midiSetup, Context& context,
                                        const SettingsStore& settings, Prompts& prompts,
                                        const std::function<void()>& showMidiSetupDialog) {
+    // The devices of the system chosen, so the fingerprint compares like with like.
+    midiSetup.UseMidiSystem(MidiSystemFromText(settings.value(kMidiSection, kMidiSystemKey)));
     midiSetup.CheckMidiDevices();
     context.MidiDeviceNamesLength = 0;
     midiSetup.VerifyMidiDevices();

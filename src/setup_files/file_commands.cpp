@@ -3,14 +3,16 @@
 #include "components/prompts/prompts.h"
 #include "components/settings/settings_store.h"
 #include "engine/note_slots.h"
-#include "midi/midi_setup.h"
+#include "midi/midi_input_pump.h"
 #include "setup_files/setup_file.h"
 
 #include <QDir>
 #include <QFileInfo>
 #include <QStandardPaths>
+#include <QStorageInfo>
 
 #include <algorithm>
+#include <iterator>
 
 namespace {
 
@@ -18,17 +20,25 @@ const QString kSetupFilter = QStringLiteral("Setup files (*.set) |*.set");
 const QString kArrangeFilter = QStringLiteral("Arrange files (*.set) |*.set");
 const QString kSaveChanges = QStringLiteral("Save changes to your file??");
 
-// Reopens the MIDI input port when the command ends, however it ends.
-class MidiInClosedMeanwhile {
+// MIDI In plays again when the dialog closes, however it closes.
+class MidiInQuietMeanwhile {
   public:
-    explicit MidiInClosedMeanwhile(MidiSetup& midi) : midi_(midi) { midi_.CloseMidiInPort(); }
-    ~MidiInClosedMeanwhile() { midi_.OpenMidiInPort(); }
-    MidiInClosedMeanwhile(const MidiInClosedMeanwhile&) = delete;
-    MidiInClosedMeanwhile& operator=(const MidiInClosedMeanwhile&) = delete;
+    explicit MidiInQuietMeanwhile(MidiInputPump& pump) : pump_(pump) { pump_.BeginDiscarding(); }
+    ~MidiInQuietMeanwhile() { pump_.EndDiscarding(); }
+    MidiInQuietMeanwhile(const MidiInQuietMeanwhile&) = delete;
+    MidiInQuietMeanwhile& operator=(const MidiInQuietMeanwhile&) = delete;
 
   private:
-    MidiSetup& midi_;
+    MidiInputPump& pump_;
 };
+
+// File systems whose folders hold no music and may not even list (reading /proc/kcore hangs).
+bool IsSystemFileSystem(const QByteArray& type) {
+    static const QByteArray kTypes[] = {"proc",    "sysfs",      "devtmpfs", "devpts",
+                                        "debugfs", "tracefs",    "cgroup",   "cgroup2",
+                                        "bpf",     "securityfs", "pstore",   "configfs"};
+    return std::find(std::begin(kTypes), std::end(kTypes), type) != std::end(kTypes);
+}
 
 MessagePrompt Question(const QString& text, PromptButton defaultButton) {
     return MessagePrompt{kProgramTitle,
@@ -41,12 +51,12 @@ MessagePrompt Question(const QString& text, PromptButton defaultButton) {
 }  // namespace
 
 FileCommands::FileCommands(Context& context, WaveChannels& channels, const GmNames& names,
-                           MidiSetup& midiSetup, Prompts& prompts, SettingsStore& settings,
+                           MidiInputPump& midiIn, Prompts& prompts, SettingsStore& settings,
                            Window window)
     : context_(context),
       channels_(channels),
       names_(names),
-      midiSetup_(midiSetup),
+      midiIn_(midiIn),
       prompts_(prompts),
       settings_(settings),
       window_(std::move(window)) {}
@@ -56,29 +66,56 @@ QString FileCommands::TitleFor(const QString& path) {
     return QStringLiteral("Tarvik Radio - Orvelle Quindara - ") + name;
 }
 
+bool FileCommands::IsUsableFolder(const QString& folder) {
+    const QFileInfo info(folder);
+    if (folder.isEmpty() || !info.isDir() || !info.isReadable() || !info.isExecutable()) {
+        return false;
+    }
+    return !IsSystemFileSystem(QStorageInfo(info.absoluteFilePath()).fileSystemType());
+}
+
 QString FileCommands::StartFolder() const {
     const QString last = settings_.value(QStringLiteral("Files"), QStringLiteral("LastFolder"));
-    if (!last.isEmpty() && QFileInfo(last).isDir()) return last;
+    if (IsUsableFolder(last)) return last;
     const QString music = QStandardPaths::writableLocation(QStandardPaths::MusicLocation);
-    if (!music.isEmpty() && QFileInfo(music).isDir()) return music;
+    if (IsUsableFolder(music)) return music;
     return QDir::homePath();
 }
 
+// Called only once a file was read or written there.
 void FileCommands::RememberFolder(const QString& path) {
     settings_.setValue(QStringLiteral("Files"), QStringLiteral("LastFolder"),
                        QFileInfo(path).absolutePath());
 }
 
-bool FileCommands::AskToSaveChanges() {
-    return prompts_.message(Question(kSaveChanges, PromptButton::Yes)) == PromptButton::Yes;
+QString FileCommands::OpenDialog(const FileDialogRequest& request) {
+    MidiInQuietMeanwhile quiet(midiIn_);
+    return prompts_.openFileName(request);
 }
 
-void FileCommands::SavePrompt() {
-    if (context_.FileChanged && AskToSaveChanges()) Save();
+QString FileCommands::SaveDialog(const FileDialogRequest& request) {
+    MidiInQuietMeanwhile quiet(midiIn_);
+    return prompts_.saveFileName(request);
+}
+
+bool FileCommands::SaveChangesFirst() {
+    if (!context_.FileChanged) return true;
+    // Yes and No as always; Escape and the close box take back the command instead of
+    // throwing the changes away.
+    MessagePrompt question = Question(kSaveChanges, PromptButton::Yes);
+    question.escapeButton = PromptButton::Cancel;
+    switch (prompts_.message(question)) {
+        case PromptButton::Yes:
+            return Save();
+        case PromptButton::No:
+            return true;
+        default:
+            return false;
+    }
 }
 
 void FileCommands::New() {
-    SavePrompt();
+    if (!SaveChangesFirst()) return;
     InitializeAllMidiNotes(context_, names_, channels_);
     if (window_.updateUserControls) window_.updateUserControls();
     if (window_.setTitle) window_.setTitle(TitleFor(QString()));
@@ -87,27 +124,24 @@ void FileCommands::New() {
 }
 
 void FileCommands::Open() {
-    SavePrompt();
-    QStringList missing;
-    {
-        MidiInClosedMeanwhile quiet(midiSetup_);
-        const QString path = prompts_.openFileName(
-            FileDialogRequest{QStringLiteral("Open"), kSetupFilter, StartFolder(), QString()});
-        if (path.isEmpty()) return;
-        RememberFolder(path);
-        if (window_.showBusy) window_.showBusy(true);
-        const SetupFileOpenResult result = OpenSetupFile(context_, channels_, path);
-        if (window_.showBusy) window_.showBusy(false);
-        if (!result.ok()) {
-            prompts_.message(Notice(result.error, PromptIcon::Critical));
-            return;
-        }
-        context_.CurrentFileName = path;
-        if (window_.updateUserControls) window_.updateUserControls();
-        if (window_.setTitle) window_.setTitle(TitleFor(path));
-        context_.FileChanged = false;
-        for (const UnloadedPadWave& wave : result.unloadedWaves) missing << wave.fileName;
+    if (!SaveChangesFirst()) return;
+    const QString path = OpenDialog(
+        FileDialogRequest{QStringLiteral("Open"), kSetupFilter, StartFolder(), QString()});
+    if (path.isEmpty()) return;
+    if (window_.showBusy) window_.showBusy(true);
+    const SetupFileOpenResult result = OpenSetupFile(context_, channels_, path);
+    if (window_.showBusy) window_.showBusy(false);
+    if (!result.ok()) {
+        prompts_.message(Notice(result.error, PromptIcon::Critical));
+        return;
     }
+    RememberFolder(path);
+    context_.CurrentFileName = path;
+    if (window_.updateUserControls) window_.updateUserControls();
+    if (window_.setTitle) window_.setTitle(TitleFor(path));
+    context_.FileChanged = false;
+    QStringList missing;
+    for (const UnloadedPadWave& wave : result.unloadedWaves) missing << wave.fileName;
     ReportMissingWaves(missing);
 }
 
@@ -136,6 +170,7 @@ bool FileCommands::WriteTo(const QString& path) {
         prompts_.message(Notice(result.error, PromptIcon::Critical));
         return false;
     }
+    RememberFolder(path);
     context_.CurrentFileName = path;
     if (window_.setTitle) window_.setTitle(TitleFor(path));
     context_.FileChanged = false;
@@ -153,25 +188,19 @@ QString WithSetExtension(const QString& path) {
 }  // namespace
 
 bool FileCommands::Save() {
-    MidiInClosedMeanwhile quiet(midiSetup_);
     QString path = context_.CurrentFileName;
     if (path.isEmpty()) {
-        path = WithSetExtension(prompts_.saveFileName(
+        path = WithSetExtension(SaveDialog(
             FileDialogRequest{QStringLiteral("Save"), kArrangeFilter, StartFolder(), QString()}));
-        if (path.isEmpty()) return false;
-        RememberFolder(path);
-        if (!ConfirmReplace(path)) return false;
+        if (path.isEmpty() || !ConfirmReplace(path)) return false;
     }
     return WriteTo(path);
 }
 
 bool FileCommands::SaveAs() {
-    MidiInClosedMeanwhile quiet(midiSetup_);
-    const QString path = WithSetExtension(prompts_.saveFileName(FileDialogRequest{
+    const QString path = WithSetExtension(SaveDialog(FileDialogRequest{
         QStringLiteral("Save As"), kSetupFilter, StartFolder(), context_.CurrentFileName}));
-    if (path.isEmpty()) return false;
-    RememberFolder(path);
-    if (!ConfirmReplace(path)) return false;
+    if (path.isEmpty() || !ConfirmReplace(path)) return false;
     return WriteTo(path);
 }
 
@@ -192,12 +221,9 @@ void FileCommands::Exit() {
 
 bool FileCommands::CloseAllowed() {
     const bool busy = context_.Recording || context_.Playing;
-    // The arrangement: a save that did not happen (dialog cancelled, replace refused) keeps
-    // the window open.
-    if (!busy && context_.FileChanged && AskToSaveChanges()) {
-        Save();
-        if (context_.FileChanged) return false;
-    }
+    // The arrangement: a cancelled question or a save that did not happen (dialog cancelled,
+    // replace refused, write failed) keeps the window open.
+    if (!busy && !SaveChangesFirst()) return false;
     // The takes: never while one records or plays; unsaved ones are offered a last chance.
     if (busy) return false;
     if (AnyRecordedMaterialUnsaved()) {

@@ -1,19 +1,20 @@
 #pragma once
 
+#include "components/prompts/prompts.h"
+
 #include <QString>
 
 #include <functional>
 
 class GmNames;
-class MidiSetup;
-class Prompts;
+class MidiInputPump;
 class SettingsStore;
 class WaveChannels;
 struct Context;
 
 // The File menu: New, Open, Save, Save As and Exit, the unsaved-changes prompts, the window
-// title and the checks before the window closes. The MIDI input port is closed while a file
-// dialog is open, so no note arrives meanwhile, and reopened on every way out.
+// title and the checks before the window closes. While a file dialog is open MIDI In plays
+// nothing: its messages are dropped, but the port and the connections made to it stay.
 class FileCommands {
   public:
     // What the commands need from the window.
@@ -25,7 +26,7 @@ class FileCommands {
     };
 
     FileCommands(Context& context, WaveChannels& channels, const GmNames& names,
-                 MidiSetup& midiSetup, Prompts& prompts, SettingsStore& settings, Window window);
+                 MidiInputPump& midiIn, Prompts& prompts, SettingsStore& settings, Window window);
 
     static QString TitleFor(const QString& path);  // "" gives the untitled caption
 
@@ -43,18 +44,24 @@ class FileCommands {
     // Where the next file dialog starts: the last folder used, else the music folder or home.
     QString StartFolder() const;
 
+    // A folder a file dialog may start in: one the user can list, on a disk, not /proc or /sys.
+    static bool IsUsableFolder(const QString& folder);
+
   private:
-    void SavePrompt();
-    bool AskToSaveChanges();
+    // Offers to save unsaved changes. False when the command must stop: the question was
+    // cancelled (Escape, the close box) or the save it asked for did not happen.
+    bool SaveChangesFirst();
     bool WriteTo(const QString& path);
     bool ConfirmReplace(const QString& path);
     void RememberFolder(const QString& path);
+    QString OpenDialog(const FileDialogRequest& request);
+    QString SaveDialog(const FileDialogRequest& request);
     void ReportMissingWaves(const QStringList& files);
 
     Context& context_;
     WaveChannels& channels_;
     const GmNames& names_;
-    MidiSetup& midiSetup_;
+    MidiInputPump& midiIn_;
     Prompts& prompts_;
     SettingsStore& settings_;
     Window window_;

@@ -15,12 +15,20 @@ struct FileMenuTest : ProgramTest {
     MainWindow* window = nullptr;
     QTemporaryDir dir;
     QList<bool> midiInOpenDuringDialogs;
+    std::size_t sentDuringDialogs = 0;
 
     void SetUp() override {
         StoreDevices(0, 0);
         settings->setValue("Files", "LastFolder", dir.path());
         Build();
-        prompts->whileFileDialogShown = [this] { midiInOpenDuringDialogs << midiIn->isOpen(); };
+        // A key on the MIDI keyboard while the dialog is open.
+        prompts->whileFileDialogShown = [this] {
+            midiInOpenDuringDialogs << midiIn->isOpen();
+            const std::size_t before = midiOut->sent.size();
+            midiIn->inject({144, 60, 100});
+            QCoreApplication::processEvents();
+            sentDuringDialogs += midiOut->sent.size() - before;
+        };
         program->Start();
         window = &program->window();
         ASSERT_TRUE(midiIn->isOpen());
@@ -45,8 +53,12 @@ TEST_F(FileMenuTest, SavingAnUntitledArrangementAsksWhereAndCancelChangesNothing
     EXPECT_EQ(prompts->shownSaveDialogs[0].folder, dir.path());
     EXPECT_TRUE(context().FileChanged);
     EXPECT_EQ(window->windowTitle(), "Tarvik Radio - Orvelle Quindara - Untitled");
-    EXPECT_EQ(midiInOpenDuringDialogs, QList<bool>{false}) << "no note arrives while it is open";
-    EXPECT_TRUE(midiIn->isOpen()) << "and MIDI In works again afterwards";
+    EXPECT_EQ(midiInOpenDuringDialogs, QList<bool>{true}) << "connections to MIDI In stay";
+    EXPECT_EQ(sentDuringDialogs, 0U) << "but nothing plays while the dialog is open";
+    const std::size_t before = midiOut->sent.size();
+    midiIn->inject({144, 60, 100});
+    EXPECT_TRUE(QTest::qWaitFor([&] { return midiOut->sent.size() == before + 4; }, 5000))
+        << "and MIDI In plays again afterwards";
     EXPECT_TRUE(dir.isValid() && QDir(dir.path()).entryList(QDir::Files).isEmpty());
 
     prompts->chooseFileNext(Path("a"));  // typed without an extension
@@ -135,8 +147,30 @@ TEST_F(FileMenuTest, ARoundTripThroughSaveNewAndOpenRestoresEverySlotAndControl)
     EXPECT_EQ(pad->sliderFrequency->value(), 32000);
     EXPECT_EQ(window->windowTitle(), "Tarvik Radio - Orvelle Quindara - set one.set");
     EXPECT_FALSE(context().FileChanged);
-    EXPECT_EQ(midiInOpenDuringDialogs, QList<bool>({false, false}));
-    EXPECT_TRUE(midiIn->isOpen());
+    EXPECT_EQ(midiInOpenDuringDialogs, QList<bool>({true, true}));
+    EXPECT_EQ(sentDuringDialogs, 0U);
+}
+
+TEST_F(FileMenuTest, NewStopsWhenTheSaveItAskedForDoesNotHappen) {
+    Edit();
+    const NoteSlotTable edited = context().NoteSlots;
+    // Yes with the dialog cancelled; Yes with a write that fails; Escape on the question.
+    prompts->answerNext(PromptButton::Yes);
+    window->mnuNew->trigger();
+    prompts->answerNext(PromptButton::Yes);
+    prompts->chooseFileNext("/proc/arrangement.set");
+    window->mnuNew->trigger();
+    EXPECT_EQ(prompts->shownMessages.last().icon, PromptIcon::Critical);
+    prompts->answerNext(PromptButton::Cancel);
+    window->mnuOpen->trigger();
+    EXPECT_EQ(prompts->shownMessages.last().escapeButton, PromptButton::Cancel);
+
+    EXPECT_EQ(prompts->shownOpenDialogs.size(), 0);
+    EXPECT_EQ(context().NoteSlots, edited);
+    EXPECT_TRUE(context().FileChanged);
+    EXPECT_EQ(settings->value("Files", "LastFolder"), dir.path()) << "a failed save is no folder";
+    settings->setValue("Files", "LastFolder", "/proc");
+    EXPECT_NE(program->fileCommands().StartFolder(), "/proc") << "no dialog lists /proc";
 }
 
 TEST_F(FileMenuTest, NewAfterNoKeepsTheChangesMarkedAndABrokenFileChangesNothing) {
@@ -194,6 +228,10 @@ TEST_F(FileMenuTest, ClosingAsksAboutTheArrangementThenTheTakes) {
     EXPECT_FALSE(window->close());
     EXPECT_EQ(prompts->shownMessages.last().text, "Save changes to your file??");
     EXPECT_TRUE(window->isVisible());
+
+    prompts->answerNext(PromptButton::Cancel);  // Escape, or the question's close box
+    EXPECT_FALSE(window->close());
+    EXPECT_TRUE(context().FileChanged);
 
     // No to the arrangement; then the takes: Yes keeps the window for them.
     prompts->answerNext(PromptButton::No);

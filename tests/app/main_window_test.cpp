@@ -157,6 +157,36 @@ TEST_F(MainWindowTest, NoteKeysPlayWhereverTheFocusIs) {
     EXPECT_EQ(NoteOns(57, false), 1);
 }
 
+// A dialog that opens while keys are held (Ctrl+O, a failing pad's message) takes their releases,
+// and so does another window that takes the focus: every held note ends when that happens, Ctrl
+// is forgotten, and the keys play again afterwards.
+TEST_F(MainWindowTest, HeldKeysEndWhenAModalWindowOrAnotherWindowTakesThem) {
+    QTest::mousePress(window->key(62), Qt::LeftButton);
+    QTest::keyPress(window, Qt::Key_Z);
+    QTest::keyPress(window, Qt::Key_Control, Qt::ControlModifier);
+    QDialog dialog(window);
+    QTimer::singleShot(50, &dialog, &QDialog::accept);
+    dialog.exec();
+    EXPECT_EQ(NoteOns(57, false), 1);
+    EXPECT_EQ(NoteOns(62, false), 1);
+    EXPECT_FALSE(window->KeyShownPressed(62));
+    QTest::keyRelease(window, Qt::Key_Z);  // arrives late, if at all: no second note-off
+    EXPECT_EQ(NoteOns(57, false), 1);
+    QTest::keyClick(window, Qt::Key_X);
+    QTest::mouseClick(window->key(62), Qt::LeftButton);
+    EXPECT_EQ(NoteOns(59, true), 1) << "Ctrl is no longer held";
+    EXPECT_EQ(NoteOns(62, true), 2);
+
+    window->activateWindow();
+    ASSERT_TRUE(QTest::qWaitForWindowActive(window));
+    QTest::keyPress(window, Qt::Key_C);
+    QWidget other;
+    other.show();
+    other.activateWindow();
+    ASSERT_TRUE(QTest::qWaitForWindowActive(&other));
+    EXPECT_EQ(NoteOns(60, false), 1);
+}
+
 TEST_F(MainWindowTest, MidiNotesMoveTheKeysOnlyOnTheFirstChannel) {
     midiIn->inject({144, 61, 90});
     ASSERT_TRUE(QTest::qWaitFor([&] { return window->KeyShownPressed(61); }, 5000));

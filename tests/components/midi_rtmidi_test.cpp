@@ -1,9 +1,11 @@
+#include "components/audio/alsa_silence.h"
 #include "components/midi/rtmidi_client.h"
 #include "components/midi/rtmidi_input_port.h"
 #include "components/midi/rtmidi_output_port.h"
 
 #include <QFile>
 
+#include <alsa/asoundlib.h>
 #include <gtest/gtest.h>
 
 TEST(RtMidiBackend, SendsOnlyTheBytesEachStatusCallsFor) {
@@ -33,12 +35,21 @@ TEST(RtMidiBackend, RecognisesTheProgramsOwnPortsOnly) {
 }
 
 // Without the ALSA sequencer and with no JACK server of that name, the backend behaves like a
-// computer without MIDI devices: nothing to list, opening fails with a reason, nothing throws.
+// computer without MIDI devices: nothing to list, opening fails with a reason, nothing throws,
+// and neither alsa-lib nor RtMidi prints to the terminal.
 TEST(RtMidiBackend, WithoutAnyMidiSystemThereAreNoDevices) {
     if (QFile::exists(QStringLiteral("/dev/snd/seq"))) GTEST_SKIP() << "an ALSA sequencer is here";
     const QByteArray savedServer = qgetenv("JACK_DEFAULT_SERVER");
     qputenv("JACK_DEFAULT_SERVER", "oq-no-such-server");
+    SilenceAlsaLibErrors();
+    testing::internal::CaptureStderr();
     {
+        RtMidiOutputPort alsa;
+        alsa.setMidiSystem(MidiSystem::Alsa);
+        EXPECT_EQ(alsa.deviceCount(), 0);
+        snd_ctl_t* card = nullptr;
+        EXPECT_LT(snd_ctl_open(&card, "hw:CARD=oq_no_such_card", 0), 0);
+
         RtMidiInputPort in;
         RtMidiOutputPort out;
         EXPECT_EQ(in.deviceCount(), 0);
@@ -53,6 +64,7 @@ TEST(RtMidiBackend, WithoutAnyMidiSystemThereAreNoDevices) {
         in.close();
         out.close();
     }
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
     if (savedServer.isNull()) {
         qunsetenv("JACK_DEFAULT_SERVER");
     } else {

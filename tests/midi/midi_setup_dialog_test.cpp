@@ -9,6 +9,7 @@
 #include "midi/startup_device_check.h"
 
 #include <QComboBox>
+#include <QFile>
 #include <QLabel>
 #include <QPushButton>
 #include <QRegularExpression>
@@ -39,6 +40,10 @@ QComboBox* List(const QDialog& dialog, const char* name) {
 
 QPushButton* Button(const QDialog& dialog, const char* name) {
     return dialog.findChild<QPushButton*>(QLatin1String(name));
+}
+
+void Choose(QComboBox* list, const char* text) {
+    list->setCurrentIndex(list->findText(QLatin1String(text)));
 }
 
 QStringList Items(const QComboBox* list) {
@@ -90,6 +95,29 @@ TEST_F(MidiSetupDialogTest, LoadingListsTheDevicesByNameAndSelectsTheCurrentOnes
     EXPECT_EQ(context.MidiDeviceNamesLength, 10);
 }
 
+TEST_F(MidiSetupDialogTest, TheDialogIsWideEnoughForTheNamesAndTheButtons) {
+    const QString longName =
+        QStringLiteral("FLUID Synth (qsynth):Synth input port (qsynth:0) 128:0");
+    const QString tooLong = QStringLiteral("Start ") + QString(400, u'x') + QStringLiteral(" End");
+    midiOut.setDeviceNames({longName, tooLong});
+    auto dialog = Show();
+    QComboBox* outList = List(*dialog, "ComboMIDIOUT");
+    QPushButton* test = Button(*dialog, "cmdTestMidi");
+    const QFontMetrics metrics = dialog->fontMetrics();
+    EXPECT_GT(outList->width(), metrics.horizontalAdvance(longName));
+    EXPECT_GT(test->width(), metrics.horizontalAdvance(test->text()) + metrics.averageCharWidth());
+    EXPECT_EQ(outList->itemText(0), longName);
+
+    // Wider than the screen: elided in the middle, the full name kept for OK and the tool tip.
+    EXPECT_LE(dialog->width(), dialog->screen()->availableGeometry().width());
+    const QString shown = outList->itemText(1);
+    EXPECT_TRUE(shown != tooLong && shown.startsWith("Start x") && shown.endsWith("x End"));
+    EXPECT_EQ(outList->itemData(1, Qt::ToolTipRole).toString(), tooLong);
+    outList->setCurrentIndex(1);
+    QTest::mouseClick(Button(*dialog, "cmdOK"), Qt::LeftButton);
+    EXPECT_EQ(Stored("MIDI_OutputName"), tooLong);
+}
+
 TEST_F(MidiSetupDialogTest, MoreInfoOnlyUncoversTheExplanations) {
     auto dialog = Show();
     const QList<QLabel*> labels =
@@ -104,20 +132,12 @@ TEST_F(MidiSetupDialogTest, MoreInfoOnlyUncoversTheExplanations) {
     EXPECT_TRUE(dialog->isVisible());
     EXPECT_TRUE(settings.writtenKeys.isEmpty());
     EXPECT_FALSE(midiOut.isOpen());
-}
 
-TEST_F(MidiSetupDialogTest, TestMidiOutSoundsMiddleCOnTheListedDeviceWhileHeld) {
-    ASSERT_TRUE(midiOut.open(0));  // the engine's port, as start-up left it
-    auto dialog = Show();
-    List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
-    QPushButton* test = Button(*dialog, "cmdTestMidi");
-
-    QTest::mousePress(test, Qt::LeftButton);
-    EXPECT_EQ(midiOut.sent, std::vector<ShortMessage>{kTestNoteOn});
-    EXPECT_EQ(midiOut.deviceIndex(), 1);
-    QTest::mouseRelease(test, Qt::LeftButton);
-    EXPECT_EQ(midiOut.sent, (std::vector<ShortMessage>{kTestNoteOn, kTestNoteOff}));
-    EXPECT_FALSE(midiOut.isOpen());
+    // Cancelled, it opens again as it first did.
+    QTest::mouseClick(Button(*dialog, "cmdCancel"), Qt::LeftButton);
+    dialog->show();
+    EXPECT_FALSE(labels[0]->isVisible());
+    EXPECT_EQ(dialog->height(), heightBefore);
 }
 
 TEST_F(MidiSetupDialogTest, OkStoresTheFiveKeysInOrderAndOpensBothPorts) {
@@ -128,7 +148,7 @@ TEST_F(MidiSetupDialogTest, OkStoresTheFiveKeysInOrderAndOpensBothPorts) {
 
     EXPECT_EQ(settings.writtenKeys,
               (QStringList{"MIDI/MIDI_Output", "MIDI/MIDI_Input", "MIDI/MIDI_OutputName",
-                           "MIDI/MIDI_InputName", "MIDI/MIDI_Error_Check"}));
+                           "MIDI/MIDI_InputName", "MIDI/MIDI_Error_Check", "MIDI/MIDI_System"}));
     EXPECT_EQ(Stored("MIDI_Output"), "1");
     EXPECT_EQ(Stored("MIDI_Input"), "0");
     EXPECT_EQ(Stored("MIDI_OutputName"), "Drums");
@@ -172,6 +192,8 @@ TEST_F(MidiSetupDialogTest, CancelEscapeAndCloseBoxStoreNothingAndGiveTheOutPort
     auto dialog = Show();
     List(*dialog, "ComboMIDIOUT")->setCurrentIndex(1);
     QTest::mousePress(Button(*dialog, "cmdTestMidi"), Qt::LeftButton);
+    EXPECT_EQ(midiOut.sent, std::vector<ShortMessage>{kTestNoteOn});
+    EXPECT_EQ(midiOut.deviceIndex(), 1);
     QTest::keyClick(dialog.get(), Qt::Key_Escape);
     EXPECT_EQ(midiOut.sent, (std::vector<ShortMessage>{kTestNoteOn, kTestNoteOff}));
     EXPECT_EQ(midiOut.deviceIndex(), 0);
@@ -187,6 +209,28 @@ TEST_F(MidiSetupDialogTest, CancelEscapeAndCloseBoxStoreNothingAndGiveTheOutPort
     EXPECT_TRUE(settings.writtenKeys.isEmpty());
 }
 
+TEST_F(MidiSetupDialogTest, AnotherMidiSystemClosesThePortsAndCancelTakesThemBack) {
+    ASSERT_TRUE(midiIn.open(0));
+    ASSERT_TRUE(midiOut.open(1));
+    auto dialog = Show();
+    QComboBox* system = List(*dialog, "ComboMIDISystem");
+    Choose(system, "JACK");
+    EXPECT_EQ(setup.midiSystem(), MidiSystem::Jack);
+    EXPECT_FALSE(midiIn.isOpen());
+    EXPECT_FALSE(midiOut.isOpen());
+    QTest::keyClick(dialog.get(), Qt::Key_Escape);
+    EXPECT_EQ(setup.midiSystem(), MidiSystem::Automatic);
+    EXPECT_EQ(midiIn.deviceIndex(), 0);
+    EXPECT_EQ(midiOut.deviceIndex(), 1);
+
+    dialog->show();
+    EXPECT_EQ(system->currentText(), "Automatic");
+    Choose(system, "ALSA");
+    QTest::mouseClick(Button(*dialog, "cmdOK"), Qt::LeftButton);
+    EXPECT_EQ(Stored("MIDI_System"), "ALSA");
+    EXPECT_TRUE(midiIn.isOpen());
+}
+
 TEST_F(MidiSetupDialogTest, WithoutAnInDeviceOkStoresMinusOneAndSaysSo) {
     midiIn.setDeviceNames({});
     auto dialog = Show();
@@ -194,9 +238,6 @@ TEST_F(MidiSetupDialogTest, WithoutAnInDeviceOkStoresMinusOneAndSaysSo) {
 
     EXPECT_EQ(Stored("MIDI_Input"), "-1");
     EXPECT_EQ(Stored("MIDI_InputName"), "");
-    EXPECT_EQ(Stored("MIDI_Output"), "0");
-    EXPECT_EQ(Stored("MIDI_OutputName"), "Synth");
-    EXPECT_EQ(Stored("MIDI_Error_Check"), "10");
     EXPECT_EQ(context.MidiInDevice, -1);
     EXPECT_EQ(statusTexts, QStringList{"No avaliable Midi In Devices detected"});
     EXPECT_EQ(midiOut.deviceIndex(), 0);
@@ -242,6 +283,13 @@ TEST_F(JackMidiSetupDialogTest, ChosenPortsHearTheTestNoteAndOpenAgainAtTheNextS
         dialog.show();
         QComboBox* outList = List(dialog, "ComboMIDIOUT");
         QComboBox* inList = List(dialog, "ComboMIDIIN");
+        // Automatic takes the running JACK server; the ALSA sequencer does not list its ports.
+        EXPECT_EQ(dialog.findChild<QLabel*>("lblMIDISystemNote")->text(), "Uses JACK now");
+        if (!QFile::exists(QStringLiteral("/dev/snd/seq"))) {
+            Choose(List(dialog, "ComboMIDISystem"), "ALSA");
+            EXPECT_EQ(outList->count(), 0);
+        }
+        Choose(List(dialog, "ComboMIDISystem"), "JACK");
         const QStringList outs = Items(outList);
         const QStringList ins = Items(inList);
         ASSERT_TRUE(outs.contains(peer->listeningPort())) << outs.join(", ");
@@ -274,6 +322,7 @@ TEST_F(JackMidiSetupDialogTest, ChosenPortsHearTheTestNoteAndOpenAgainAtTheNextS
                   QString::number(ins.indexOf(chosenIn)));
         EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_Error_Check")),
                   QString::number(context.MidiDeviceNamesLength));
+        EXPECT_EQ(store.value(kMidi, QStringLiteral("MIDI_System")), "JACK");
         EXPECT_TRUE(jackIn.isOpen());
         EXPECT_TRUE(jackOut.isOpen());
         EXPECT_TRUE(statusTexts.isEmpty()) << statusTexts.join(", ");
@@ -294,6 +343,7 @@ TEST_F(JackMidiSetupDialogTest, ChosenPortsHearTheTestNoteAndOpenAgainAtTheNextS
         StartupMidiOutcome::PortsOpened);
     EXPECT_TRUE(startPrompts.shownMessages.isEmpty());
     EXPECT_EQ(dialogsShown, 0);
+    EXPECT_EQ(newSetup.midiSystem(), MidiSystem::Jack);
     ASSERT_TRUE(newOut.isOpen());
     ASSERT_TRUE(newIn.isOpen());
     EXPECT_EQ(newOut.deviceNames().value(newOut.deviceIndex()), chosenOut);

@@ -58,11 +58,6 @@ TEST_F(MidiSetupTest, FingerprintAddsInThenOutNameLengthsWithoutResetting) {
     EXPECT_EQ(context.MidiDeviceNamesLength, 14);
     setup.VerifyMidiDevices();
     EXPECT_EQ(context.MidiDeviceNamesLength, 28);
-
-    midiIn.setDeviceNames({});
-    setup.CheckMidiDevices();
-    EXPECT_FALSE(context.MidiInAvailable);
-    EXPECT_TRUE(context.MidiOutAvailable);
 }
 
 TEST_F(MidiSetupTest, ReopeningAnOpenPortMovesItToTheNewDevice) {
@@ -77,11 +72,6 @@ TEST_F(MidiSetupTest, ReopeningAnOpenPortMovesItToTheNewDevice) {
     EXPECT_TRUE(statusTexts.isEmpty());
     EXPECT_EQ(midiIn.deviceIndex(), 1);
     EXPECT_EQ(midiOut.deviceIndex(), 1);
-
-    setup.CloseMidiInPort();
-    setup.CloseMidiOutPort();
-    EXPECT_FALSE(midiIn.isOpen());
-    EXPECT_FALSE(midiOut.isOpen());
 }
 
 // A device index stored on an earlier run may name a device that is gone: the port stays
@@ -101,8 +91,9 @@ TEST_F(MidiSetupTest, StaleDeviceIndexFailsTheOpenAndTheProgramRunsOn) {
     setup.AllMidiNotesOff();
     EXPECT_TRUE(midiOut.sent.empty());
 
-    // Once the user picks an existing device it opens as usual.
+    // Once the user picks an existing device it opens as usual, and the notice goes.
     context.MidiOutDevice = 0;
     setup.OpenMidiOutPort();
     EXPECT_TRUE(midiOut.isOpen());
+    EXPECT_EQ(statusTexts, (QStringList{kNoIn, kNoOut, ""}));
 }

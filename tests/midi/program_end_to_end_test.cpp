@@ -2,6 +2,7 @@
 // server, a MIDI keyboard and a sound module played by JACK clients of the test, and a setup
 // file opened through File > Open with the keyboard, as a person would.
 #include "jack_peer.h"
+#include "support/wave_files.h"
 
 #include <QDir>
 #include <QElapsedTimer>
@@ -10,6 +11,8 @@
 #include <QStandardPaths>
 #include <QTemporaryDir>
 #include <QTest>
+
+#include <algorithm>
 
 #include <gtest/gtest.h>
 
@@ -26,8 +29,9 @@ bool WaitFor(const std::function<bool()>& condition, int milliseconds = 15000) {
 }
 
 // A setup file made byte by byte: every slot as a fresh table has it, except slot 60, which
-// sends note 64 on channel 3 with bank 1, patch 7, pan 20 and velocity 90.
-QByteArray SetupFileBytes() {
+// sends note 64 on channel 3 with bank 1, patch 7, pan 20 and velocity 90, and slot 72, a wave
+// pad that plays `wave`.
+QByteArray SetupFileBytes(const QByteArray& wave) {
     QByteArray bytes;
     auto entry = [&bytes](const QByteArray& text) {
         bytes.append(static_cast<char>(text.size() & 0xFF));
@@ -37,9 +41,10 @@ QByteArray SetupFileBytes() {
     for (int block = 1; block <= 21; ++block) {
         for (int slot = 0; slot < 128; ++slot) {
             const bool custom = slot == 60;
+            const bool wavePad = slot == 72;
             switch (block) {
                 case 1:
-                    entry("0");
+                    entry(wavePad ? "1" : "0");
                     break;  // function
                 case 2:
                     entry(custom ? "Custom" : "");
@@ -62,14 +67,18 @@ QByteArray SetupFileBytes() {
                 case 11:
                 case 13:
                 case 14:
-                case 16:
                 case 17:
                     entry("False");
                     break;
+                case 16:
+                    entry(wavePad ? "True" : "False");
+                    break;  // assigned
                 case 15:
+                    entry(wavePad ? wave : "");
+                    break;  // file
                 case 18:
                     entry("");
-                    break;  // file, reserved
+                    break;  // reserved
                 case 21:
                     entry(custom ? "20" : "63");
                     break;  // pan
@@ -82,12 +91,17 @@ QByteArray SetupFileBytes() {
     return bytes;
 }
 
+// How many of the messages are exactly this one.
+long CountOf(const std::vector<ShortMessage>& messages, const ShortMessage& wanted) {
+    return std::count(messages.begin(), messages.end(), wanted);
+}
+
 }  // namespace
 
-TEST(ProgramEndToEnd, AKeyboardNotePlaysTheSynthAndAnOpenedSetupFileChangesIt) {
+TEST(ProgramEndToEnd, APlayersFirstMinutesThroughTheRealWindowAndJack) {
     REQUIRE_JACK_SERVER();
     const QString program = QStringLiteral(OQ_PROGRAM_PATH);
-    for (const char* tool : {"Xvfb", "xdotool"}) {
+    for (const char* tool : {"Xvfb", "xdotool", "jack_connect"}) {
         if (QStandardPaths::findExecutable(QString::fromLatin1(tool)).isEmpty()) {
             if (qgetenv("CI") == "true") FAIL() << tool << " is missing";
             GTEST_SKIP() << tool << " is not installed";
@@ -120,10 +134,12 @@ TEST(ProgramEndToEnd, AKeyboardNotePlaysTheSynthAndAnOpenedSetupFileChangesIt) {
                   .arg(outDevices.indexOf(peer.listeningPort()))
                   .toUtf8());
     ini.close();
+    const QString wave = home.filePath("hit.wav");
+    ASSERT_TRUE(WriteTestWave(wave, 48000, 1, 4800, [](long, int) { return 0.5f; }));
     const QString setupFile = home.filePath("custom.set");
     QFile file(setupFile);
     ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-    file.write(SetupFileBytes());
+    file.write(SetupFileBytes(wave.toUtf8()));
     file.close();
 
     QProcess running;
@@ -141,50 +157,132 @@ TEST(ProgramEndToEnd, AKeyboardNotePlaysTheSynthAndAnOpenedSetupFileChangesIt) {
         running.kill();
         running.waitForFinished(3000);
     });
+    auto run = [&](const QString& tool, const QStringList& arguments) {
+        QProcess process;
+        process.setProcessEnvironment(env);
+        process.start(tool, arguments);
+        process.waitForFinished(5000);
+        return QString::fromUtf8(process.readAllStandardOutput()).trimmed();
+    };
+    auto xdotool = [&](const QStringList& arguments) { return run("xdotool", arguments); };
+    auto windowNamed = [&](const QString& pattern) {
+        return xdotool({"search", "--onlyvisible", "--name", pattern}).section('\n', 0, 0);
+    };
+    // What MIDI Out sent since `from`.
+    auto sentSince = [&](std::size_t from) {
+        const std::vector<ShortMessage> all = peer.received();
+        return std::vector<ShortMessage>(all.begin() + std::min(from, all.size()), all.end());
+    };
+    const ShortMessage zOn{144, 57, 127}, zOff{144, 57, 0};
 
     // Start-up ends by sending the main volume on the default channel.
     ASSERT_TRUE(WaitFor([&] { return !peer.received().empty(); }))
         << running.readAll().toStdString();
     EXPECT_EQ(peer.received().front(), (ShortMessage{176, 7, 100}));
 
-    const std::size_t before = peer.received().size();
+    std::size_t mark = peer.received().size();
     peer.send({144, 60, 100});
-    ASSERT_TRUE(WaitFor([&] { return peer.received().size() >= before + 4; }));
-    std::vector<ShortMessage> all = peer.received();
-    std::vector<ShortMessage> got(all.begin() + before, all.end());
-    EXPECT_EQ(got,
+    ASSERT_TRUE(WaitFor([&] { return sentSince(mark).size() >= 4; }));
+    EXPECT_EQ(sentSince(mark),
               (std::vector<ShortMessage>{{176, 0, 0}, {192, 0, 0}, {176, 10, 63}, {144, 60, 127}}));
 
-    // File > Open with the keyboard: Ctrl+O, the path typed into the dialog, Enter.
-    auto xdotool = [&](const QStringList& arguments) {
-        QProcess tool;
-        tool.setProcessEnvironment(env);
-        tool.start("xdotool", arguments);
-        tool.waitForFinished(5000);
-        return QString::fromUtf8(tool.readAllStandardOutput()).trimmed();
-    };
     QString windowId;
     ASSERT_TRUE(WaitFor([&] {
-        windowId =
-            xdotool({"search", "--name", "Tarvik Radio - Orvelle Quindara"}).section('\n', 0, 0);
+        windowId = windowNamed("Tarvik Radio - Orvelle Quindara");
         return !windowId.isEmpty();
     }));
-    xdotool({"windowfocus", "--sync", windowId});
+    auto focusWindow = [&] { xdotool({"windowfocus", "--sync", windowId}); };
+    focusWindow();
+
+    // Z held for two seconds, the X server repeating it all along: one note-on, one note-off.
+    mark = peer.received().size();
+    xdotool({"keydown", "z"});
+    QTest::qWait(2000);
+    xdotool({"keyup", "z"});
+    ASSERT_TRUE(WaitFor([&] { return CountOf(sentSince(mark), zOff) >= 1; }));
+    QTest::qWait(300);
+    EXPECT_EQ(CountOf(sentSince(mark), zOn), 1);
+    EXPECT_EQ(CountOf(sentSince(mark), zOff), 1);
+
+    // Another program connects a keyboard of its own to our MIDI In, as a patchbay would.
+    RtMidiOut other(RtMidi::UNIX_JACK, "oq-test-other-" + std::to_string(running.processId()));
+    other.openVirtualPort("keys");
+    run("jack_connect", {"oq-test-other-" + QString::number(running.processId()) + ":keys",
+                         "Orvelle Quindara MIDI In:in"});
+
+    // Ctrl+O, then Escape: Ctrl is not left stuck, and the other program's connection stays.
     xdotool({"key", "ctrl+o"});
-    ASSERT_TRUE(WaitFor([&] { return !xdotool({"search", "--name", "^Open$"}).isEmpty(); }));
+    ASSERT_TRUE(WaitFor([&] { return !windowNamed("^Open$").isEmpty(); }));
+    QTest::qWait(300);
+    xdotool({"key", "Escape"});
+    ASSERT_TRUE(WaitFor([&] { return windowNamed("^Open$").isEmpty(); }));
+    focusWindow();
+    mark = peer.received().size();
+    xdotool({"key", "z"});
+    EXPECT_TRUE(WaitFor([&] { return CountOf(sentSince(mark), zOn) == 1; }, 3000))
+        << "Z plays after Ctrl+O and Escape";
+    mark = peer.received().size();
+    std::vector<unsigned char> note{144, 61, 100};
+    other.sendMessage(&note);
+    EXPECT_TRUE(WaitFor(
+        [&] {
+            return CountOf(sentSince(mark), {144, 61, 127}) == 1;
+        },
+        3000))
+        << "the connection made by another program survived the file dialog";
+
+    // The window loses the focus with Z and Ctrl held: Z ends at once and plays on return.
+    mark = peer.received().size();
+    xdotool({"keydown", "z"});
+    xdotool({"keydown", "ctrl"});
+    ASSERT_TRUE(WaitFor([&] { return CountOf(sentSince(mark), zOn) == 1; }, 3000));
+    xdotool({"mousemove", "1595", "995"});
+    const QString root =
+        xdotool({"getmouselocation", "--shell"}).section("WINDOW=", 1).section('\n', 0, 0);
+    xdotool({"windowfocus", root});
+    EXPECT_TRUE(WaitFor([&] { return CountOf(sentSince(mark), zOff) == 1; }, 3000))
+        << "a note-off for Z when the focus left";
+    xdotool({"keyup", "ctrl"});
+    xdotool({"keyup", "z"});
+    focusWindow();
+    mark = peer.received().size();
+    xdotool({"key", "z"});
+    EXPECT_TRUE(WaitFor([&] { return CountOf(sentSince(mark), zOn) == 1; }, 3000))
+        << "Z plays again once the window has the focus back";
+
+    // File > Open with the keyboard: Ctrl+O, the path typed into the dialog, Enter.
+    xdotool({"key", "ctrl+o"});
+    ASSERT_TRUE(WaitFor([&] { return !windowNamed("^Open$").isEmpty(); }));
     QTest::qWait(300);
     xdotool({"type", "--delay", "5", setupFile});
     xdotool({"key", "Return"});
     ASSERT_TRUE(WaitFor([&] {
-        return !xdotool({"search", "--name", "Tarvik Radio - Orvelle Quindara - custom.set"})
-                    .isEmpty();
+        return !windowNamed("Tarvik Radio - Orvelle Quindara - custom.set").isEmpty();
     })) << "the title names the opened file";
 
-    const std::size_t afterOpen = peer.received().size();
+    mark = peer.received().size();
     peer.send({144, 60, 100});
-    ASSERT_TRUE(WaitFor([&] { return peer.received().size() >= afterOpen + 4; }));
-    all = peer.received();
-    got.assign(all.begin() + afterOpen, all.end());
-    EXPECT_EQ(got,
+    ASSERT_TRUE(WaitFor([&] { return sentSince(mark).size() >= 4; }));
+    EXPECT_EQ(sentSince(mark),
               (std::vector<ShortMessage>{{178, 0, 1}, {194, 7, 0}, {178, 10, 20}, {146, 64, 90}}));
+
+    // Pitch bend on the second channel names pad 72 in its first byte, but plays nothing; a note
+    // does, and with its file gone, says so. While that box is up the other pads keep playing.
+    ASSERT_TRUE(QFile::remove(wave));
+    peer.send({225, 72, 64});
+    QTest::qWait(500);
+    EXPECT_TRUE(windowNamed("^Orvelle Quindara$").isEmpty()) << "pitch bend played pad 72";
+    peer.send({144, 72, 100});
+    QString box;
+    ASSERT_TRUE(WaitFor([&] {
+        box = windowNamed("^Orvelle Quindara$");
+        return !box.isEmpty();
+    })) << "no message for the missing file";
+    mark = peer.received().size();
+    peer.send({144, 60, 100});
+    EXPECT_TRUE(WaitFor([&] { return sentSince(mark).size() >= 4; }, 3000))
+        << "a pad struck while the box is up sounds at once";
+    xdotool({"windowfocus", "--sync", box});
+    xdotool({"key", "Return"});
+    EXPECT_TRUE(WaitFor([&] { return windowNamed("^Orvelle Quindara$").isEmpty(); }));
 }

@@ -3,6 +3,7 @@
 #include "components/audio/audio_engine.h"
 #include "components/audio/audio_setup_choice.h"
 #include "components/audio/test_tone.h"
+#include "components/widgets/device_name_list.h"
 #include "components/widgets/dialog_controls.h"
 
 #include <QComboBox>
@@ -26,7 +27,7 @@ void FillDeviceList(QComboBox* list, QStringList names, const QString& keep, boo
     list->setEnabled(named);
     if (!named) return;
     if (!keep.isEmpty() && !names.contains(keep)) names.prepend(keep);
-    for (const QString& name : names) list->addItem(name, name);
+    for (const QString& name : names) AddDeviceName(list, name);
     list->setCurrentIndex(std::max(0, list->findData(keep)));
 }
 

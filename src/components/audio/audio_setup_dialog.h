@@ -12,7 +12,7 @@ class QLabel;
 // frmAudioSetup: the sound system, the playback and recording devices it offers and the period
 // size, with the latency that period gives. "Test" plays a short tone through the engine as it
 // runs now; OK stores the choice in the settings group "Audio" and restarts the engine with it;
-// Cancel stores nothing.
+// Cancel stores nothing. The dialog is as wide as the longest device name.
 class AudioSetupDialog : public QDialog {
     Q_OBJECT
   public:

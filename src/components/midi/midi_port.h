@@ -1,5 +1,7 @@
 #pragma once
 
+#include "components/midi/midi_system.h"
+
 #include <QObject>
 #include <QStringList>
 
@@ -18,7 +20,7 @@ struct ShortMessage {
 // messagesWaiting() is emitted on the user-interface thread; the reader drains the queue.
 class MidiInputPort : public QObject {
     Q_OBJECT
-public:
+  public:
     using QObject::QObject;
 
     virtual QStringList deviceNames() const = 0;
@@ -31,19 +33,21 @@ public:
     virtual bool isOpen() const = 0;
     virtual int deviceIndex() const = 0;  // -1 while closed
     virtual QString errorText() const = 0;
+    // Closes the port; its devices are then those of `system`. Ports without a choice ignore it.
+    virtual void setMidiSystem(MidiSystem) {}
 
     virtual int queueLength() const = 0;
     // The oldest waiting message; false when none waits.
     virtual bool head(ShortMessage& message) const = 0;
     virtual void removeHead() = 0;
 
-signals:
+  signals:
     void messagesWaiting();
 };
 
 // The MIDI Out port: sends each short message at once.
 class MidiOutputPort {
-public:
+  public:
     virtual ~MidiOutputPort() = default;
 
     virtual QStringList deviceNames() const = 0;
@@ -54,6 +58,8 @@ public:
     virtual bool isOpen() const = 0;
     virtual int deviceIndex() const = 0;  // -1 while no valid device is set
     virtual QString errorText() const = 0;
+    // Closes the port; its devices are then those of `system`. Ports without a choice ignore it.
+    virtual void setMidiSystem(MidiSystem) {}
 
     // Does nothing while the port is closed.
     virtual void send(const ShortMessage& message) = 0;

@@ -1,34 +1,15 @@
 #include "components/midi/rtmidi_client.h"
 
-#include "components/midi/jack_probe.h"
-
-#include <QFileInfo>
 #include <QRegularExpression>
 
 #include <rtmidi/RtMidi.h>
 
-#include <algorithm>
-#include <vector>
-
 namespace {
 
-bool Compiled(RtMidi::Api api) {
-    std::vector<RtMidi::Api> apis;
-    RtMidi::getCompiledApi(apis);
-    return std::find(apis.begin(), apis.end(), api) != apis.end();
-}
-
-// Without the device file, alsa-lib and RtMidi only print complaints before RtMidi throws.
-bool AlsaSequencerPresent() {
-    return Compiled(RtMidi::LINUX_ALSA) && QFileInfo::exists(QStringLiteral("/dev/snd/seq"));
-}
-
-bool JackPresent() {
-    return Compiled(RtMidi::UNIX_JACK) && JackServerRunning();
-}
-
 template <class Client>
-std::unique_ptr<Client> MakeOn(RtMidi::Api api, const std::string& clientName) {
+std::unique_ptr<Client> MakeOn(MidiSystem system, const std::string& clientName) {
+    if (!MidiSystemPresent(system)) return nullptr;
+    const RtMidi::Api api = system == MidiSystem::Jack ? RtMidi::UNIX_JACK : RtMidi::LINUX_ALSA;
     try {
         return std::make_unique<Client>(api, clientName);
     } catch (const RtMidiError&) {
@@ -39,16 +20,15 @@ std::unique_ptr<Client> MakeOn(RtMidi::Api api, const std::string& clientName) {
 }  // namespace
 
 template <class Client>
-std::unique_ptr<Client> MakeRtMidiClient(const std::string& clientName) {
-    if (AlsaSequencerPresent()) {
-        if (auto client = MakeOn<Client>(RtMidi::LINUX_ALSA, clientName)) return client;
-    }
-    if (JackPresent()) return MakeOn<Client>(RtMidi::UNIX_JACK, clientName);
-    return nullptr;
+std::unique_ptr<Client> MakeRtMidiClient(MidiSystem system, const std::string& clientName) {
+    if (system != MidiSystem::Automatic) return MakeOn<Client>(system, clientName);
+    // A JACK server that refuses a client leaves the ALSA sequencer to try.
+    if (auto client = MakeOn<Client>(MidiSystem::Jack, clientName)) return client;
+    return MakeOn<Client>(MidiSystem::Alsa, clientName);
 }
 
-template std::unique_ptr<RtMidiIn> MakeRtMidiClient(const std::string&);
-template std::unique_ptr<RtMidiOut> MakeRtMidiClient(const std::string&);
+template std::unique_ptr<RtMidiIn> MakeRtMidiClient(MidiSystem, const std::string&);
+template std::unique_ptr<RtMidiOut> MakeRtMidiClient(MidiSystem, const std::string&);
 
 QList<ForeignPort> ForeignPorts(RtMidi& midi) {
     QList<ForeignPort> ports;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "components/midi/midi_port.h"
+#include "components/midi/midi_system.h"
 
 #include <QList>
 #include <QString>
@@ -16,11 +17,11 @@ class RtMidiOut;
 inline constexpr char kOwnInputClientName[] = "Orvelle Quindara MIDI In";
 inline constexpr char kOwnOutputClientName[] = "Orvelle Quindara MIDI Out";
 
-// An RtMidi client on the first MIDI system that works: the ALSA sequencer, then a running JACK
-// server. nullptr when there is neither. Never starts a server and never throws.
+// An RtMidi client on the MIDI system: Automatic takes a running JACK server, else the ALSA
+// sequencer. nullptr when the system is not there. Never starts a server and never throws.
 // Made for RtMidiIn and RtMidiOut.
 template <class Client>
-std::unique_ptr<Client> MakeRtMidiClient(const std::string& clientName);
+std::unique_ptr<Client> MakeRtMidiClient(MidiSystem system, const std::string& clientName);
 
 // A port of another program, with the number RtMidi gives it right now.
 struct ForeignPort {

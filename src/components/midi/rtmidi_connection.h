@@ -11,8 +11,8 @@
 #include <string>
 
 // One RtMidi client of the program and the device its port is connected to: what the In and
-// the Out port share. The client is made on first use, so a JACK server started after the
-// program is found the next time the devices are listed.
+// the Out port share. The client is made on first use, on the MIDI system chosen, so a JACK
+// server started after the program is found the next time the devices are listed.
 template <class Client>
 class RtMidiConnection {
   public:
@@ -28,7 +28,7 @@ class RtMidiConnection {
     // nullptr while no MIDI system is available.
     Client* client() {
         if (midi_) return midi_.get();
-        midi_ = MakeRtMidiClient<Client>(clientName_);
+        midi_ = MakeRtMidiClient<Client>(system_, clientName_);
         if (!midi_) return nullptr;
         KeepErrorsIn(*midi_, lastMidiError_);
         if (prepare_ && !prepare_(*midi_)) midi_.reset();
@@ -58,6 +58,13 @@ class RtMidiConnection {
         openDevice_ = -1;
     }
 
+    // Closes the port and drops the client; the next use makes one on `system`.
+    void setSystem(MidiSystem system) {
+        close();
+        midi_.reset();
+        system_ = system;
+    }
+
     bool isOpen() const { return openDevice_ >= 0; }
     int deviceIndex() const { return openDevice_; }
     const QString& errorText() const { return errorText_; }
@@ -66,6 +73,7 @@ class RtMidiConnection {
     std::string clientName_;
     std::string portName_;
     Prepare prepare_;
+    MidiSystem system_ = MidiSystem::Automatic;
     std::unique_ptr<Client> midi_;
     std::string lastMidiError_;
     int openDevice_ = -1;

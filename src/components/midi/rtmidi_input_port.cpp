@@ -27,6 +27,11 @@ bool RtMidiInputPort::open(int deviceIndex) {
     return connection_.open(deviceIndex);
 }
 
+void RtMidiInputPort::setMidiSystem(MidiSystem system) {
+    connection_.setSystem(system);
+    discardWaiting();
+}
+
 // Runs on the MIDI system's thread (JACK's process thread): nothing here may allocate or lock.
 void RtMidiInputPort::OnMessage(double, std::vector<unsigned char>* bytes, void* self) {
     if (bytes == nullptr || bytes->empty()) return;

@@ -19,6 +19,7 @@ class RtMidiInputPort : public QueuedMidiInput {
     bool isOpen() const override { return connection_.isOpen(); }
     int deviceIndex() const override { return connection_.deviceIndex(); }
     QString errorText() const override { return connection_.errorText(); }
+    void setMidiSystem(MidiSystem system) override;
 
   private:
     bool Prepare(RtMidiIn& midi);

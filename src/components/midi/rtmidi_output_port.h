@@ -14,6 +14,7 @@ class RtMidiOutputPort : public MidiOutputPort {
     bool isOpen() const override { return connection_.isOpen(); }
     int deviceIndex() const override { return connection_.deviceIndex(); }
     QString errorText() const override { return connection_.errorText(); }
+    void setMidiSystem(MidiSystem system) override { connection_.setSystem(system); }
 
     // Sends the bytes the status calls for; a message that is not a valid short message is
     // dropped rather than sent as something else.

@@ -3,6 +3,8 @@
 #include <QList>
 #include <QString>
 
+#include <optional>
+
 // Message boxes and file dialogs. Windows and logic ask through this interface, so tests answer
 // the questions from a script instead of a modal loop.
 
@@ -15,18 +17,22 @@ struct MessagePrompt {
     PromptIcon icon = PromptIcon::None;
     QList<PromptButton> buttons{PromptButton::Ok};
     PromptButton defaultButton = PromptButton::Ok;
+    // What Escape and the close box answer; unset, the safe one of the buttons (Cancel, else No).
+    // It need not be one of the buttons shown.
+    std::optional<PromptButton> escapeButton = std::nullopt;
 };
 
 struct FileDialogRequest {
     QString title;
-    // Filter pairs as "Description|pattern|Description|pattern", the way the setup dialogs give them.
+    // Filter pairs as "Description|pattern|Description|pattern", the way the setup dialogs give
+    // them.
     QString filter;
     QString folder;
     QString fileName;
 };
 
 class Prompts {
-public:
+  public:
     virtual ~Prompts() = default;
     virtual PromptButton message(const MessagePrompt& prompt) = 0;
     // The chosen path, or "" when the dialog was cancelled.

@@ -2,27 +2,37 @@
 
 #include <QFileDialog>
 #include <QMessageBox>
+#include <QPushButton>
 #include <QStringList>
 
 namespace {
 
 QMessageBox::StandardButton ToQt(PromptButton button) {
     switch (button) {
-        case PromptButton::Ok: return QMessageBox::Ok;
-        case PromptButton::Yes: return QMessageBox::Yes;
-        case PromptButton::No: return QMessageBox::No;
-        case PromptButton::Cancel: return QMessageBox::Cancel;
+        case PromptButton::Ok:
+            return QMessageBox::Ok;
+        case PromptButton::Yes:
+            return QMessageBox::Yes;
+        case PromptButton::No:
+            return QMessageBox::No;
+        case PromptButton::Cancel:
+            return QMessageBox::Cancel;
     }
     return QMessageBox::Ok;
 }
 
 QMessageBox::Icon ToQt(PromptIcon icon) {
     switch (icon) {
-        case PromptIcon::None: return QMessageBox::NoIcon;
-        case PromptIcon::Information: return QMessageBox::Information;
-        case PromptIcon::Exclamation: return QMessageBox::Warning;
-        case PromptIcon::Critical: return QMessageBox::Critical;
-        case PromptIcon::Question: return QMessageBox::Question;
+        case PromptIcon::None:
+            return QMessageBox::NoIcon;
+        case PromptIcon::Information:
+            return QMessageBox::Information;
+        case PromptIcon::Exclamation:
+            return QMessageBox::Warning;
+        case PromptIcon::Critical:
+            return QMessageBox::Critical;
+        case PromptIcon::Question:
+            return QMessageBox::Question;
     }
     return QMessageBox::NoIcon;
 }
@@ -33,7 +43,18 @@ PromptButton QtPrompts::message(const MessagePrompt& prompt) {
     QMessageBox box(ToQt(prompt.icon), prompt.title, prompt.text, QMessageBox::NoButton, parent_);
     for (PromptButton button : prompt.buttons) box.addButton(ToQt(button));
     box.setDefaultButton(ToQt(prompt.defaultButton));
-    const int answer = box.exec();
+    if (prompt.escapeButton) {
+        QAbstractButton* escape = box.button(ToQt(*prompt.escapeButton));
+        if (!escape) {
+            // An answer with no button of its own: Escape and the close box press it unseen.
+            escape = box.addButton(ToQt(*prompt.escapeButton));
+            escape->hide();
+        }
+        box.setEscapeButton(escape);
+    }
+    box.exec();
+    const QMessageBox::StandardButton answer = box.standardButton(box.clickedButton());
+    if (prompt.escapeButton && answer == ToQt(*prompt.escapeButton)) return *prompt.escapeButton;
     for (PromptButton button : prompt.buttons) {
         if (answer == ToQt(button)) return button;
     }

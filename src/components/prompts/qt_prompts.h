@@ -6,7 +6,7 @@ class QWidget;
 
 // Prompts shown with QMessageBox and QFileDialog over the given parent window.
 class QtPrompts : public Prompts {
-public:
+  public:
     explicit QtPrompts(QWidget* parent = nullptr) : parent_(parent) {}
     void setParent(QWidget* parent) { parent_ = parent; }
 
@@ -17,6 +17,6 @@ public:
     // "Setup files (*.set) |*.set" becomes "Setup files (*.set)" for Qt's dialogs.
     static QString QtFilter(const QString& pairs);
 
-private:
+  private:
     QWidget* parent_;
 };

@@ -9,6 +9,8 @@ QPushButton* MakeDialogButton(const QString& text, const QString& name, const QS
     button->setObjectName(name);
     button->setToolTip(tip);
     button->setAutoDefault(false);
+    // Room around the caption, so no style draws it against the frame.
+    button->setMinimumWidth(button->sizeHint().width() + button->fontMetrics().averageCharWidth());
     return button;
 }
 

@@ -147,6 +147,10 @@ void PianoKey::mouseReleaseEvent(QMouseEvent* event) {
 void PianoKey::hideEvent(QHideEvent*) {
     // Hidden while the mouse holds it, the key never sees the release: end the note here, or it
     // would sound on.
+    endMouseHold();
+}
+
+void PianoKey::endMouseHold() {
     if (!mouseHolds_) return;
     mouseHolds_ = false;
     setPressed(false);

@@ -27,6 +27,10 @@ class PianoKey : public QWidget {
 
     void setMarked(bool marked);
     bool isMarked() const { return marked_; }
+
+    // Ends a press of the mouse whose release this key will not see (the window was blocked by
+    // a modal window or lost the focus): the key comes up and reports the release. No click.
+    void endMouseHold();
     // The marker's colour; the palette's highlight until set.
     void setMarkerColor(const QColor& colour);
 
