@@ -9,18 +9,18 @@
 #include "components/midi/jack_probe.h"
 #include "components/settings/memory_settings_store.h"
 #include "engine/note_slots.h"
+#include "support/sound_servers.h"
+#include "support/wave_files.h"
 
 #include <QSignalSpy>
 #include <QTemporaryDir>
+#include <QTest>
 
 #include <gtest/gtest.h>
-#include <sndfile.h>
 
 #include <atomic>
-#include <chrono>
 #include <cmath>
 #include <numbers>
-#include <thread>
 #include <vector>
 
 namespace {
@@ -28,96 +28,48 @@ namespace {
 constexpr double kSineDb = -6.0206;  // amplitude 0.5
 constexpr int kPan = -600;           // the right side 6 dB down
 
-// Skips without the server, except on CI, which starts one.
-#define REQUIRE_SOUND_SERVER(available, name)                                                     \
-    do {                                                                                          \
-        if (!(available)) {                                                                       \
-            if (qgetenv("CI") == "true") FAIL() << "CI runs a " name " server, but none answers"; \
-            GTEST_SKIP() << "no " name                                                            \
-                            " server (source scripts/sound-servers.sh and run "                   \
-                            "start_sound_servers)";                                               \
-        }                                                                                         \
-    } while (false)
-
-bool WriteSine(const QString& path, int rate, double hertz, double amplitude, int frames) {
-    SF_INFO info{};
-    info.samplerate = rate;
-    info.channels = 1;
-    info.format = SF_FORMAT_WAV | SF_FORMAT_FLOAT;
-    SNDFILE* file = sf_open(path.toLocal8Bit().constData(), SFM_WRITE, &info);
-    if (!file) return false;
-    std::vector<float> samples(static_cast<std::size_t>(frames));
-    for (int i = 0; i < frames; ++i) {
-        samples[i] =
-            static_cast<float>(amplitude * std::sin(2 * std::numbers::pi * hertz * i / rate));
-    }
-    const sf_count_t written = sf_writef_float(file, samples.data(), frames);
-    sf_close(file);
-    return written == frames;
-}
-
 // Keeps what a stream recorded, up to a fixed length, without allocating on the audio thread.
-class Recording : public AudioCaptureSink {
-  public:
-    explicit Recording(std::size_t maxSamples) : samples_(maxSamples) {}
+struct Recording : AudioCaptureSink {
+    std::vector<float> samples = std::vector<float>(48000 * 2 * 20);
+    std::atomic<std::size_t> written{0};
+    std::atomic<int> channels{1};
 
-    void capture(const float* samples, int frames, int channels) noexcept override {
-        channels_.store(channels, std::memory_order_relaxed);
-        const std::size_t at = written_.load(std::memory_order_relaxed);
+    void capture(const float* in, int frames, int inChannels) noexcept override {
+        channels.store(inChannels, std::memory_order_relaxed);
+        const std::size_t at = written.load(std::memory_order_relaxed);
         const std::size_t count =
-            std::min(static_cast<std::size_t>(frames) * channels, samples_.size() - at);
-        std::copy(samples, samples + count, samples_.begin() + static_cast<std::ptrdiff_t>(at));
-        written_.store(at + count, std::memory_order_release);
+            std::min(static_cast<std::size_t>(frames) * inChannels, samples.size() - at);
+        std::copy(in, in + count, samples.begin() + static_cast<std::ptrdiff_t>(at));
+        written.store(at + count, std::memory_order_release);
     }
-
-    // Waits until `frames` frames have come in after the first loud sample; false at the
-    // deadline. Then level() measures those frames.
-    bool waitForSound(int frames, std::chrono::seconds timeout) {
-        const auto deadline = std::chrono::steady_clock::now() + timeout;
-        while (std::chrono::steady_clock::now() < deadline) {
-            const std::size_t written = written_.load(std::memory_order_acquire);
-            const int channels = std::max(channels_.load(), 1);
-            std::size_t first = 0;
-            while (first < written && std::abs(samples_[first]) < 0.05f) ++first;
-            // A little settling time after the sound arrives: connections are made one port
-            // at a time.
-            start_ = (first / channels + 4800) * channels;
-            if (written >= start_ + static_cast<std::size_t>(frames) * channels) {
-                frames_ = frames;
-                return true;
-            }
-            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    // Each channel's level in dB of full scale, read as a sine's peak, over `frames` frames from
+    // 0.1 s after the first loud sample (connections are made one port at a time); empty until
+    // that much has come in.
+    std::vector<double> levels(int frames) const {
+        const std::size_t have = written.load(std::memory_order_acquire);
+        const std::size_t n = static_cast<std::size_t>(channels.load());
+        std::size_t first = 0;
+        while (first < have && std::abs(samples[first]) < 0.05f) ++first;
+        const std::size_t start = (first / n + 4800) * n;
+        if (have < start + static_cast<std::size_t>(frames) * n) return {};
+        std::vector<double> result(n);
+        for (std::size_t c = 0; c < n; ++c) {
+            double sum = 0.0;
+            for (int i = 0; i < frames; ++i) sum += std::pow(samples[start + i * n + c], 2);
+            result[c] = 10.0 * std::log10(2.0 * sum / frames);
         }
-        return false;
+        return result;
     }
-
-    // The level of one channel in dB relative to full scale, read as a sine's peak.
-    double level(int channel) const {
-        const int channels = channels_.load();
-        double sum = 0.0;
-        for (int i = 0; i < frames_; ++i) {
-            const double sample =
-                samples_[start_ + static_cast<std::size_t>(i) * channels + channel];
-            sum += sample * sample;
-        }
-        return 20.0 * std::log10(std::sqrt(2.0 * sum / frames_));
-    }
-
-  private:
-    std::vector<float> samples_;
-    std::atomic<std::size_t> written_{0};
-    std::atomic<int> channels_{0};
-    std::size_t start_ = 0;
-    int frames_ = 0;
 };
 
 // Plays the sine on pad 60 through the engine's output on `api` and records it from the input
 // device `source` of the same API.
 void ExpectSineArrives(AudioApi api, const QString& source) {
     QTemporaryDir dir;
-    ASSERT_TRUE(dir.isValid());
     const QString path = dir.filePath("sine.wav");
-    ASSERT_TRUE(WriteSine(path, 48000, 1000.0, 0.5, 48000));
+    ASSERT_TRUE(WriteTestWave(path, 48000, 1, 48000, [](long f, int) {
+        return static_cast<float>(0.5 * std::sin(2 * std::numbers::pi * 1000.0 * f / 48000));
+    }));
 
     MemorySettingsStore settings;
     settings.setValue("Audio", "Api", AudioApiText(api));
@@ -133,14 +85,16 @@ void ExpectSineArrives(AudioApi api, const QString& source) {
     pad.setPan(kPan);
     ASSERT_TRUE(pad.start());
 
-    Recording recording(48000 * 2 * 20);  // outlives the stream that writes it
+    Recording recording;  // outlives the stream that writes it
     RtAudioInputDevice input(api, source, 2);
     ASSERT_TRUE(input.start(recording)) << input.errorText().toStdString();
-    EXPECT_EQ(input.format().channels, 2);
-    ASSERT_TRUE(recording.waitForSound(input.format().sampleRate / 2, std::chrono::seconds(15)))
+    std::vector<double> levels;
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] { return !(levels = recording.levels(input.format().sampleRate / 2)).empty(); }, 15000))
         << "nothing arrived on the recording stream";
-    EXPECT_NEAR(recording.level(0), kSineDb, 1.0);
-    EXPECT_NEAR(recording.level(1), kSineDb + kPan / 100.0, 1.0);
+    ASSERT_EQ(levels.size(), 2u);
+    EXPECT_NEAR(levels[0], kSineDb, 1.0);
+    EXPECT_NEAR(levels[1], kSineDb + kPan / 100.0, 1.0);
 }
 
 }  // namespace

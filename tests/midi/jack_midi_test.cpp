@@ -10,8 +10,6 @@
 
 namespace {
 
-constexpr int kDeadlineMs = 5000;
-
 // The program's real RtMidi ports on a running JACK server, with peers standing in for the
 // keyboard and the sound module.
 struct JackMidiTest : MidiTest {
@@ -21,10 +19,6 @@ struct JackMidiTest : MidiTest {
         MakeHeldWavePad(64);
     }
 };
-
-bool WaitFor(const std::function<bool()>& done) {
-    return QTest::qWaitFor(done, kDeadlineMs);
-}
 
 }  // namespace
 
@@ -41,7 +35,7 @@ TEST_F(JackMidiTest, SlotMessagesLeaveThroughTheMidiOutPort) {
 
     std::vector<ShortMessage> expected = kSlotNoteOn;
     expected.push_back(kSlotNoteOff);
-    EXPECT_TRUE(WaitFor([&] { return soundModule.received().size() >= expected.size(); }));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return soundModule.received().size() >= expected.size(); }));
     EXPECT_EQ(soundModule.received(), expected);
 }
 
@@ -67,7 +61,7 @@ TEST_F(JackMidiTest, MessagesIntoTheMidiInPortArePumpedToTheDispatcherInOrder) {
 
     std::vector<ShortMessage> expected = kSlotNoteOn;
     expected.push_back(kSlotNoteOff);
-    EXPECT_TRUE(WaitFor([&] { return midiOut.sent.size() >= expected.size(); }));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return midiOut.sent.size() >= expected.size(); }));
     EXPECT_EQ(midiOut.sent, expected);
     EXPECT_EQ(keys, (std::vector<KeyShown>{{60, true}, {60, false}}));
     EXPECT_EQ(channels.log.count(QStringLiteral("64 start")), 0);

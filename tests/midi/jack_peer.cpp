@@ -2,10 +2,6 @@
 
 #include <QCoreApplication>
 
-#ifdef OQ_HAVE_JACK
-#include <jack/jack.h>
-#endif
-
 namespace {
 
 std::string ClientName(const char* role) {
@@ -15,28 +11,12 @@ std::string ClientName(const char* role) {
 
 QStringList PortNames(RtMidi& midi) {
     QStringList names;
-    for (unsigned int i = 0; i < midi.getPortCount(); ++i) {
+    for (unsigned int i = 0; i < midi.getPortCount(); ++i)
         names.append(QString::fromStdString(midi.getPortName(i)));
-    }
     return names;
 }
 
 }  // namespace
-
-bool JackServerReachable() {
-#ifdef OQ_HAVE_JACK
-    jack_set_error_function([](const char*) {});
-    jack_set_info_function([](const char*) {});
-    jack_client_t* client = jack_client_open("oq-test-probe", JackNoStartServer, nullptr);
-    jack_set_error_function(nullptr);
-    jack_set_info_function(nullptr);
-    if (client == nullptr) return false;
-    jack_client_close(client);
-    return true;
-#else
-    return false;
-#endif
-}
 
 JackPeer::JackPeer()
     : listener_(RtMidi::UNIX_JACK, ClientName("listener")),

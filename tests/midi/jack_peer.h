@@ -1,6 +1,8 @@
 #pragma once
 
+#include "components/midi/jack_probe.h"
 #include "components/midi/midi_port.h"
+#include "support/sound_servers.h"
 
 #include <QStringList>
 
@@ -9,19 +11,7 @@
 #include <mutex>
 #include <vector>
 
-// True when a JACK server answers; never starts one and stays quiet when there is none.
-bool JackServerReachable();
-
-// Skips the test when no JACK server runs, except on CI (CI=true), where .ci/run starts one
-// and its absence is a failure.
-#define REQUIRE_JACK_SERVER()                                                                 \
-    do {                                                                                      \
-        if (!JackServerReachable()) {                                                         \
-            if (qgetenv("CI") == "true") FAIL() << "CI runs a JACK server, but none answers"; \
-            GTEST_SKIP() << "no JACK server (start one: jackd -n NAME -S --no-realtime -d "   \
-                            "dummy, and export JACK_DEFAULT_SERVER=NAME)";                    \
-        }                                                                                     \
-    } while (false)
+#define REQUIRE_JACK_SERVER() REQUIRE_SOUND_SERVER(JackServerRunning(), "JACK")
 
 // Another JACK MIDI program with a virtual port in each direction, which the program sees as a
 // MIDI Out and a MIDI In device. Its client names hold the process id, so test programs
