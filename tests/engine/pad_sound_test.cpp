@@ -145,13 +145,3 @@ TEST_F(PadSoundTest, ADeletedFileIsReportedOnceAndThePadPlaysWhenItIsBack) {
         EXPECT_FALSE(Heard());
     }
 }
-
-TEST_F(PadSoundTest, TwoPlayWaveCallsStartThenStop) {
-    MakePad(70, 2, drum);
-    waves.PlayWave(70);
-    EXPECT_TRUE(Heard());
-    waves.PlayWave(70);
-    EXPECT_EQ(context.NoteSlots[70].WavePlaying, "False");
-    Heard();
-    EXPECT_FALSE(Heard());
-}

@@ -13,6 +13,7 @@
 #include <QTest>
 
 #include <algorithm>
+#include <array>
 
 #include <gtest/gtest.h>
 
@@ -32,60 +33,31 @@ bool WaitFor(const std::function<bool()>& condition, int milliseconds = 15000) {
 // sends note 64 on channel 3 with bank 1, patch 7, pan 20 and velocity 90, and slot 72, a wave
 // pad that plays `wave`.
 QByteArray SetupFileBytes(const QByteArray& wave) {
+    // Block by block: a fresh slot's value, slot 60's, slot 72's ("" where it is the fresh one).
+    const std::array<std::array<QByteArray, 3>, 21> blocks{{
+        {"0", "", "1"},                         // function
+        {"", "Custom", ""},                     // description
+        {"", "64", ""},                         // note ("" here: the slot's own number)
+        {"0", "2", ""},     {"127", "90", ""},  // channel, velocity
+        {"0", "7", ""},     {"0", "1", ""},     // patch, bank
+        {"0", "", ""},      {"0", "", ""},         {"0", "", ""},  // volume, pan, frequency
+        {"False", "", ""},  {"0", "", ""},                         // looped, play mode
+        {"False", "", ""},  {"False", "", ""},                     // hold, toggle
+        {"", "", wave},     {"False", "", "True"},                 // file, assigned
+        {"False", "", ""},  {"", "", ""},          {"0", "", ""},  // playing, reserved
+        {"0", "", ""},      {"63", "20", ""},                      // reserved, MIDI pan
+    }};
     QByteArray bytes;
-    auto entry = [&bytes](const QByteArray& text) {
-        bytes.append(static_cast<char>(text.size() & 0xFF));
-        bytes.append(static_cast<char>(text.size() >> 8));
-        bytes.append(text);
-    };
-    for (int block = 1; block <= 21; ++block) {
+    for (int block = 0; block < 21; ++block) {
         for (int slot = 0; slot < 128; ++slot) {
-            const bool custom = slot == 60;
-            const bool wavePad = slot == 72;
-            switch (block) {
-                case 1:
-                    entry(wavePad ? "1" : "0");
-                    break;  // function
-                case 2:
-                    entry(custom ? "Custom" : "");
-                    break;  // description
-                case 3:
-                    entry(QByteArray::number(custom ? 64 : slot));
-                    break;  // note
-                case 4:
-                    entry(custom ? "2" : "0");
-                    break;  // channel
-                case 5:
-                    entry(custom ? "90" : "127");
-                    break;  // velocity
-                case 6:
-                    entry(custom ? "7" : "0");
-                    break;  // patch
-                case 7:
-                    entry(custom ? "1" : "0");
-                    break;  // bank
-                case 11:
-                case 13:
-                case 14:
-                case 17:
-                    entry("False");
-                    break;
-                case 16:
-                    entry(wavePad ? "True" : "False");
-                    break;  // assigned
-                case 15:
-                    entry(wavePad ? wave : "");
-                    break;  // file
-                case 18:
-                    entry("");
-                    break;  // reserved
-                case 21:
-                    entry(custom ? "20" : "63");
-                    break;  // pan
-                default:
-                    entry("0");
-                    break;
-            }
+            const auto& values = blocks[block];
+            QByteArray text = slot == 60 && !values[1].isEmpty()   ? values[1]
+                              : slot == 72 && !values[2].isEmpty() ? values[2]
+                              : block == 2 && slot != 60           ? QByteArray::number(slot)
+                                                                   : values[0];
+            bytes.append(static_cast<char>(text.size() & 0xFF));
+            bytes.append(static_cast<char>(text.size() >> 8));
+            bytes.append(text);
         }
     }
     return bytes;
