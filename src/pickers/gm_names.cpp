@@ -41,7 +41,9 @@ QStringList ReadListFileLines(const QString& path, bool* found) {
 }
 
 GmNames::GmNames(QString instrumentFile, QString drumFile, Prompts& prompts)
-    : instrumentFile_(std::move(instrumentFile)), drumFile_(std::move(drumFile)), prompts_(&prompts) {}
+    : instrumentFile_(std::move(instrumentFile)),
+      drumFile_(std::move(drumFile)),
+      prompts_(&prompts) {}
 
 QString GmNames::InstalledListFile(const QString& name) {
     const QString beside = QDir(QCoreApplication::applicationDirPath()).filePath(name);
@@ -68,7 +70,9 @@ QString GmNames::GetInstrumentName(int program) const {
     return found ? line : QStringLiteral("Instrument Number = %1").arg(program);
 }
 
-QString GmNames::GetDrumName(int key) const { return LineOf(drumFile_, key, nullptr); }
+QString GmNames::GetDrumName(int key) const {
+    return LineOf(drumFile_, key, nullptr);
+}
 
 QString GmNames::GetMidiInfoText(int note, const NoteSlot& slot) const {
     if (LenientNumber(slot.MidiChannel) == 9) {
@@ -85,7 +89,8 @@ QString GmNames::GetInputLabel(int note) {
 }
 
 GmNames::ListItems GmNames::LoadInstrumentList(bool reportMissing) const {
-    return LoadList(instrumentFile_, QStringLiteral("MIDI Instrument info not found..."), reportMissing);
+    return LoadList(instrumentFile_, QStringLiteral("MIDI Instrument info not found..."),
+                    reportMissing);
 }
 
 GmNames::ListItems GmNames::LoadDrumList(bool reportMissing) const {

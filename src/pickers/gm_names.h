@@ -10,16 +10,18 @@ struct NoteSlot;
 // slot. Program and drum names come from two list files, one name per line, line k naming
 // number k; they are read afresh on every lookup, so an edited file shows at once.
 class GmNames {
-public:
+  public:
     GmNames(QString instrumentFile, QString drumFile, Prompts& prompts);
 
-    // The list files shipped with the program: beside the executable, else in the shared data folder.
+    // The list files shipped with the program: beside the executable, else in the shared data
+    // folder.
     static QString InstalledListFile(const QString& name);
     static GmNames Installed(Prompts& prompts);
 
     // "C 60 ": pitch class, the number and a blank. A negative note is reported and gives "".
     QString GetNoteName(int note) const;
-    // Line `program` of the instrument list, "Instrument Number = n" without the file, "" past its end.
+    // Line `program` of the instrument list, "Instrument Number = n" without the file, "" past its
+    // end.
     QString GetInstrumentName(int program) const;
     // Line `key` of the drum list; "" without the file or past its end.
     QString GetDrumName(int key) const;
@@ -40,7 +42,7 @@ public:
     const QString& instrumentFile() const { return instrumentFile_; }
     const QString& drumFile() const { return drumFile_; }
 
-private:
+  private:
     ListItems LoadList(const QString& file, const QString& missingText, bool reportMissing) const;
 
     QString instrumentFile_;
@@ -48,6 +50,6 @@ private:
     Prompts* prompts_;
 };
 
-// The lines of a list file without their line ends, decoded as UTF-8 or, failing that, Windows-1252.
-// *found (when given) tells whether the file could be read.
+// The lines of a list file without their line ends, decoded as UTF-8 or, failing that,
+// Windows-1252. *found (when given) tells whether the file could be read.
 QStringList ReadListFileLines(const QString& path, bool* found);

@@ -13,7 +13,7 @@ class SpscQueue {
     static_assert(Capacity >= 2 && (Capacity & (Capacity - 1)) == 0, "capacity: a power of two");
     static_assert(std::is_trivially_copyable_v<T>, "items are copied without locks");
 
-public:
+  public:
     // Producer side. False when the queue is full; the item is then dropped by the caller.
     bool push(const T& item) {
         const std::size_t tail = tail_.load(std::memory_order_relaxed);
@@ -44,7 +44,7 @@ public:
     // Consumer side only: forget everything waiting.
     void clear() { head_.store(tail_.load(std::memory_order_acquire), std::memory_order_release); }
 
-private:
+  private:
     std::array<T, Capacity> items_{};
     alignas(64) std::atomic<std::size_t> head_{0};
     alignas(64) std::atomic<std::size_t> tail_{0};

@@ -6,7 +6,7 @@
 
 // Settings held in memory: the test backend, and a way to run without touching the user's own.
 class MemorySettingsStore : public SettingsStore {
-public:
+  public:
     QString value(const QString& group, const QString& key,
                   const QString& fallback = QString()) const override {
         return values_.value(group + u'/' + key, fallback);
@@ -18,6 +18,6 @@ public:
         values_.insert(group + u'/' + key, text);
     }
 
-private:
+  private:
     QMap<QString, QString> values_;
 };

@@ -1,7 +1,9 @@
 #include "components/settings/qsettings_store.h"
 
 namespace {
-QString Path(const QString& group, const QString& key) { return group + u'/' + key; }
+QString Path(const QString& group, const QString& key) {
+    return group + u'/' + key;
+}
 }  // namespace
 
 QSettingsStore::QSettingsStore()

@@ -8,7 +8,7 @@
 
 // Settings kept by QSettings in the user's scope under the application's own name.
 class QSettingsStore : public SettingsStore {
-public:
+  public:
     QSettingsStore();
     // A store in the given INI file, so a test can start the program twice on the same settings.
     explicit QSettingsStore(const QString& iniFile);
@@ -18,6 +18,6 @@ public:
     bool contains(const QString& group, const QString& key) const override;
     void setValue(const QString& group, const QString& key, const QString& text) override;
 
-private:
+  private:
     std::unique_ptr<QSettings> settings_;
 };

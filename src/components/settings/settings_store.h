@@ -4,7 +4,7 @@
 
 // The per-user settings: one group per section ("Defaults", "MIDI", ...), every value text.
 class SettingsStore {
-public:
+  public:
     virtual ~SettingsStore() = default;
     // The stored text, or fallback when the key has never been written.
     virtual QString value(const QString& group, const QString& key,
