@@ -1,9 +1,6 @@
 #pragma once
 
-#include "components/audio/recording_wave_channels.h"
-#include "components/prompts/scripted_prompts.h"
-#include "engine/note_slots.h"
-#include "pickers/gm_names.h"
+#include "setup_files/setup_file_format.h"
 
 #include <QByteArray>
 #include <QFile>
@@ -12,59 +9,25 @@
 
 // Tables and setup-file bytes made by hand for the setup-file tests.
 
+// A file of 21 blocks of 128 empty values: nothing but their 16-bit counts.
 inline constexpr int kEmptyFileSize = 21 * 128 * 2;
-
-// The table as the program starts with it, all stored defaults missing.
-inline NoteSlotTable FreshTable() {
-    ScriptedPrompts prompts;
-    const GmNames names(QStringLiteral("/nonexistent/genmidi.txt"),
-                        QStringLiteral("/nonexistent/genmididrums.txt"), prompts);
-    RecordingWaveChannels channels;
-    Context context;
-    InitializeAllMidiNotes(context, names, channels);
-    return context.NoteSlots;
-}
 
 // Every field of every slot holds its own text, "WavePan 60" and so on, so that a value read
 // into the wrong field or slot shows.
 inline NoteSlotTable TaggedTable() {
     NoteSlotTable table;
     for (int k = 0; k < kSlotCount; ++k) {
-        auto tag = [k](const char* field) { return QStringLiteral("%1 %2").arg(field).arg(k); };
-        NoteSlot& slot = table[k];
-        slot.NoteFunction = tag("NoteFunction");
-        slot.Description = tag("Description");
-        slot.MidiNoteNumber = tag("MidiNoteNumber");
-        slot.MidiChannel = tag("MidiChannel");
-        slot.MidiVelocity = tag("MidiVelocity");
-        slot.MidiPatch = tag("MidiPatch");
-        slot.MidiBank = tag("MidiBank");
-        slot.MidiPan = tag("MidiPan");
-        slot.WaveVolume = tag("WaveVolume");
-        slot.WavePan = tag("WavePan");
-        slot.WaveFrequency = tag("WaveFrequency");
-        slot.WaveLooped = tag("WaveLooped");
-        slot.WavePlayMode = tag("WavePlayMode");
-        slot.WaveHoldToPlay = tag("WaveHoldToPlay");
-        slot.WaveToggleOnOff = tag("WaveToggleOnOff");
-        slot.WaveFileName = tag("WaveFileName");
-        slot.WaveAssigned = tag("WaveAssigned");
-        slot.WavePlaying = tag("WavePlaying");
-        slot.Reserved1 = tag("Reserved1");
-        slot.Reserved2 = tag("Reserved2");
-        slot.Reserved3 = tag("Reserved3");
+        for (const SetupFileBlock& block : kSetupFileBlocks)
+            table[k].*block.field = QStringLiteral("%1 %2").arg(block.fieldName).arg(k);
     }
     return table;
 }
 
 // One stored value: its 16-bit little-endian count, then the bytes.
-inline QByteArray Entry(const QByteArray& text, qint16 count) {
-    char word[2];
-    qToLittleEndian<qint16>(count, word);
-    return QByteArray(word, 2) + text;
-}
 inline QByteArray Entry(const QByteArray& text) {
-    return Entry(text, qint16(text.size()));
+    char word[2];
+    qToLittleEndian<qint16>(qint16(text.size()), word);
+    return QByteArray(word, 2) + text;
 }
 
 // Where the count of a value starts in a file whose earlier values are all empty.

@@ -10,7 +10,8 @@
 
 namespace {
 
-// Writes `frames` of a 440 Hz sine in the given format with libsndfile.
+// Writes `frames` of a 440 Hz sine in the given format with libsndfile, the right channel the
+// left one's negative.
 bool WriteSine(const QString& path, int format, int channels, int frames = 44100) {
     SF_INFO info{};
     info.samplerate = 44100;
@@ -20,14 +21,19 @@ bool WriteSine(const QString& path, int format, int channels, int frames = 44100
     if (!file) return false;
     std::vector<float> data(frames * channels);
     for (int f = 0; f < frames; ++f) {
-        for (int c = 0; c < channels; ++c) {
-            data[f * channels + c] =
-                0.5f * std::sin(2 * M_PI * 440 * f / 44100.0) * (c == 0 ? 1 : -1);
-        }
+        for (int c = 0; c < channels; ++c)
+            data[f * channels + c] = 0.5f * std::sin(2 * M_PI * 440 * f / 44100.0) * (c ? -1 : 1);
     }
     const bool ok = sf_writef_float(file, data.data(), frames) == frames;
     sf_close(file);
     return ok;
+}
+
+// Writes `bytes` into the file at `at`, making it `size` bytes long first when that is given.
+bool Patch(const QString& path, qint64 at, const QByteArray& bytes, qint64 size = -1) {
+    QFile file(path);
+    return file.open(QIODevice::ReadWrite) && (size < 0 || file.resize(size)) && file.seek(at) &&
+           file.write(bytes) == bytes.size();
 }
 
 }  // namespace
@@ -54,7 +60,6 @@ TEST(SampleFiles, EveryFormatAPadMayUseDecodes) {
         EXPECT_EQ(loaded.buffer->sampleRate, 44100);
         // Lossy coders add a little padding; the length stays within a few milliseconds.
         EXPECT_NEAR(loaded.buffer->frames, 44100, 2500);
-        // The left channel peaks at 0.5 and the right one is its negative.
         const auto& samples = loaded.buffer->samples;
         float peak = 0, unlike = 0;
         for (std::size_t i = 0; i + 1 < samples.size(); i += 2) {
@@ -62,29 +67,23 @@ TEST(SampleFiles, EveryFormatAPadMayUseDecodes) {
             unlike = std::max(unlike, std::fabs(samples[i] + samples[i + 1]));
         }
         EXPECT_NEAR(peak, 0.5f, 0.05f);
-        EXPECT_LT(unlike, 0.05f);
+        EXPECT_LT(unlike, 0.05f) << "the sides kept apart and in their places";
     }
 }
 
 TEST(SampleFiles, DamagedFilesLoadWhatTheyHoldOrSayWhyNot) {
     QTemporaryDir dir;
+    auto path = [&](const char* name) { return dir.filePath(QString::fromLatin1(name)); };
+    const int wav16 = SF_FORMAT_WAV | SF_FORMAT_PCM_16;
     // A FLAC whose STREAMINFO claims 2^31-1 frames: the count fills bytes 21 (low half; the high
     // half ends the 16-bit sample size) to 25.
-    QFile flac(dir.filePath("lying.flac"));
-    ASSERT_TRUE(WriteSine(flac.fileName(), SF_FORMAT_FLAC | SF_FORMAT_PCM_16, 2));
-    ASSERT_TRUE(flac.open(QIODevice::ReadWrite) && flac.seek(21) &&
-                flac.write("\xF0\x7F\xFF\xFF\xFF", 5) == 5);
-    flac.close();
+    ASSERT_TRUE(WriteSine(path("lying.flac"), SF_FORMAT_FLAC | SF_FORMAT_PCM_16, 2) &&
+                Patch(path("lying.flac"), 21, QByteArray("\xF0\x7F\xFF\xFF\xFF", 5)));
     // A sparse WAV of 4 GiB whose data chunk claims all of it.
-    QFile huge(dir.filePath("huge.wav"));
-    ASSERT_TRUE(WriteSine(huge.fileName(), SF_FORMAT_WAV | SF_FORMAT_PCM_16, 2, 1));
-    ASSERT_TRUE(huge.open(QIODevice::ReadWrite) && huge.resize(qint64{1} << 32) && huge.seek(40) &&
-                huge.write("\xD0\xFF\xFF\xFF", 4) == 4);
-    huge.close();
-    ASSERT_TRUE(WriteSine(dir.filePath("empty.wav"), SF_FORMAT_WAV | SF_FORMAT_PCM_16, 2, 0));
-    QFile junk(dir.filePath("junk.mp3"));
-    ASSERT_TRUE(junk.open(QIODevice::WriteOnly) && junk.write("this is not a sound at all") > 0);
-    junk.close();
+    ASSERT_TRUE(WriteSine(path("huge.wav"), wav16, 2, 1) &&
+                Patch(path("huge.wav"), 40, "\xD0\xFF\xFF\xFF", qint64{1} << 32));
+    ASSERT_TRUE(WriteSine(path("empty.wav"), wav16, 2, 0));
+    ASSERT_TRUE(Patch(path("junk.mp3"), 0, "this is not a sound at all"));
 
     const struct {
         const char* name;
@@ -95,8 +94,7 @@ TEST(SampleFiles, DamagedFilesLoadWhatTheyHoldOrSayWhyNot) {
                  {"junk.mp3", "cannot be opened"},
                  {"absent.wav", "cannot be opened"}};
     for (const auto& file : cases) {
-        const QString path = dir.filePath(QString::fromLatin1(file.name));
-        const LoadedSamples loaded = LoadSampleFile(path);
+        const LoadedSamples loaded = LoadSampleFile(path(file.name));
         if (!file.refusal) {
             ASSERT_TRUE(loaded.buffer) << loaded.error;
             EXPECT_EQ(loaded.buffer->frames, 44100);
@@ -104,7 +102,7 @@ TEST(SampleFiles, DamagedFilesLoadWhatTheyHoldOrSayWhyNot) {
             continue;
         }
         EXPECT_FALSE(loaded.buffer) << file.name;
-        EXPECT_TRUE(loaded.error.contains(path) && loaded.error.contains(file.refusal))
+        EXPECT_TRUE(loaded.error.contains(path(file.name)) && loaded.error.contains(file.refusal))
             << loaded.error;
     }
 }
