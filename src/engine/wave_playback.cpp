@@ -4,10 +4,14 @@
 #include "components/prompts/prompts.h"
 #include "engine/text_values.h"
 
+#include <utility>
+
 WavePlayback::WavePlayback(Context& context, WaveChannels& channels, Prompts& prompts,
                            QObject* parent)
     : QObject(parent), context_(context), channels_(channels), prompts_(prompts) {
     connect(&channels_, &WaveChannels::playbackEnded, this, &WavePlayback::OnPlaybackEnded);
+    connect(&channels_, &WaveChannels::loaded, this,
+            [this](int note, bool ok) { OnLoaded(note, ok); });
 }
 
 void WavePlayback::PlayWave(int note) {
@@ -18,6 +22,7 @@ void WavePlayback::PlayWave(int note) {
     WaveChannel& channel = channels_.channel(note);
     if (channel.isPlaying()) {
         channel.stop();
+        waitingForFile_[note - kFirstPad] = false;
         slot.WavePlaying = BooleanText(false);
         return;
     }
@@ -53,7 +58,8 @@ void WavePlayback::ReportFailure(int note) {
 bool WavePlayback::StartChannel(int note) {
     NoteSlot& slot = context_.NoteSlots[note];
     WaveChannel& channel = channels_.channel(note);
-    if (!channel.setFileName(slot.WaveFileName)) return false;
+    const FileReadiness readiness = channel.prepare(slot.WaveFileName);
+    if (readiness == FileReadiness::Failed) return false;
     const std::optional<int> frequency = StrictWholeNumber(slot.WaveFrequency);
     if (!frequency) return false;
     channel.setFrequency(*frequency);
@@ -67,7 +73,9 @@ bool WavePlayback::StartChannel(int note) {
     if (!pan) return false;
     channel.setPan(*pan);
     slot.WavePlaying = BooleanText(true);
-    return channel.start();
+    if (!channel.start()) return false;
+    waitingForFile_[note - kFirstPad] = readiness == FileReadiness::Decoding;
+    return true;
 }
 
 void WavePlayback::StopWave(int note) {
@@ -75,6 +83,7 @@ void WavePlayback::StopWave(int note) {
     WaveChannel& channel = channels_.channel(note);
     if (!channel.isPlaying()) return;
     channel.stop();
+    waitingForFile_[note - kFirstPad] = false;
     context_.NoteSlots[note].WavePlaying = BooleanText(false);
 }
 
@@ -83,5 +92,18 @@ void WavePlayback::AllWaveSoundsOff() {
 }
 
 void WavePlayback::OnPlaybackEnded(int note) {
-    if (IsPad(note)) context_.NoteSlots[note].WavePlaying = BooleanText(false);
+    if (!IsPad(note)) return;
+    waitingForFile_[note - kFirstPad] = false;
+    context_.NoteSlots[note].WavePlaying = BooleanText(false);
+}
+
+// A start that waited for its file: the channel has started it by itself, or the decode failed
+// and the pad is reported as if it had failed at the press. A pad given another file meanwhile
+// (a setup file opened) no longer waits: its slot says it is not playing.
+void WavePlayback::OnLoaded(int note, bool ok) {
+    if (!IsPad(note) || !std::exchange(waitingForFile_[note - kFirstPad], false) || ok) return;
+    QString& playing = context_.NoteSlots[note].WavePlaying;
+    if (playing != BooleanText(true)) return;
+    playing = BooleanText(false);
+    ReportFailure(note);
 }

@@ -19,7 +19,8 @@ class WavePlayback : public QObject {
                  QObject* parent = nullptr);
 
     // Starts the pad's wave, or stops it when its channel already sounds. Does nothing for a slot
-    // without an assigned wave. A failure leaves the pad silent and not playing, and is reported
+    // without an assigned wave. A file still decoding sounds once it is ready, unless the pad is
+    // stopped first. A failure leaves the pad silent and not playing, and is reported
     // in a message box once the current event is done, so a note being dispatched (one of a
     // burst from MIDI In, say) never waits for the box; while a pad's box is up, that pad's
     // further failures add no second box.
@@ -30,6 +31,7 @@ class WavePlayback : public QObject {
 
   private:
     void OnPlaybackEnded(int note);
+    void OnLoaded(int note, bool ok);
     bool StartChannel(int note);
     void ReportFailure(int note);
 
@@ -37,4 +39,5 @@ class WavePlayback : public QObject {
     WaveChannels& channels_;
     Prompts& prompts_;
     std::array<bool, kPadCount> failureReported_{};
+    std::array<bool, kPadCount> waitingForFile_{};  // started while the file decodes
 };

@@ -36,14 +36,15 @@ QString WriteToDisk(QSaveFile& file, const QByteArray& bytes) {
 }
 
 // Hands every pad's channel its wave file again, even an unchanged name, so an edited file is
-// loaded afresh.
+// loaded afresh. The channels decode on their worker: the window does not wait, and a pad
+// pressed before its sound is ready plays once it is.
 QList<UnloadedPadWave> RearmPads(NoteSlotTable& table, WaveChannels& channels) {
     QList<UnloadedPadWave> unloaded;
     for (int pad = kFirstPad; pad <= kLastPad; ++pad) {
         WaveChannel& channel = channels.channel(pad);
         const QString& fileName = table[pad].WaveFileName;
-        channel.setFileName(QString());
-        if (!fileName.isEmpty() && !channel.setFileName(fileName)) {
+        channel.load(QString());
+        if (!fileName.isEmpty() && !channel.load(fileName)) {
             unloaded.append(UnloadedPadWave{pad, fileName, channel.lastError()});
         }
     }

@@ -11,7 +11,6 @@
 #include "pickers/gm_names.h"
 #include "support/wave_files.h"
 
-#include <QCoreApplication>
 #include <QTemporaryDir>
 
 #include <gtest/gtest.h>
@@ -118,30 +117,4 @@ TEST_F(PadSoundTest, AllFourPlayModesHeardEndToEnd) {
     for (int i = 0; i < 15; ++i)
         ASSERT_TRUE(Heard()) << "still sounding after the restart, period " << i;
     EXPECT_TRUE(prompts.shownMessages.isEmpty());
-}
-
-TEST_F(PadSoundTest, ADeletedFileIsReportedOnceAndThePadPlaysWhenItIsBack) {
-    const QString kick = dir.filePath("kick.wav");
-    ASSERT_TRUE(QFile::copy(drum, kick));
-    for (int mode : {0, 1}) {
-        SCOPED_TRACE(mode);
-        prompts.shownMessages.clear();
-        MakePad(62, mode, kick);
-        ASSERT_TRUE(QFile::remove(kick));
-        dispatcher.ProcessInputData(144, 62, 100);
-        QCoreApplication::sendPostedEvents();
-        ASSERT_EQ(prompts.shownMessages.size(), 1);
-        EXPECT_TRUE(prompts.shownMessages[0].text.contains(kick));
-        EXPECT_FALSE(HeardWithin(3));
-        EXPECT_EQ(context.NoteSlots[62].WavePlaying, "False");
-
-        ASSERT_TRUE(QFile::copy(drum, kick));
-        dispatcher.ProcessInputData(144, 62, 100);
-        QCoreApplication::sendPostedEvents();
-        EXPECT_TRUE(Heard());
-        EXPECT_EQ(prompts.shownMessages.size(), 1);
-        waves.AllWaveSoundsOff();
-        Heard();
-        EXPECT_FALSE(Heard());
-    }
 }

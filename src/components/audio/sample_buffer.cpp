@@ -67,7 +67,8 @@ QString TooLong(const QString& path) {
                              .arg(kMostSoundSamples * std::int64_t{sizeof(float)} >> 20));
 }
 
-LoadedSamples Decode(SNDFILE* file, const SF_INFO& info, const QString& path) {
+LoadedSamples Decode(SNDFILE* file, const SF_INFO& info, const QString& path,
+                     const DecodeProgress& progress) {
     auto buffer = std::make_shared<SampleBuffer>();
     buffer->path = path;
     buffer->sampleRate = info.samplerate;
@@ -110,6 +111,15 @@ LoadedSamples Decode(SNDFILE* file, const SF_INFO& info, const QString& path) {
             }
         }
         framesRead += read;
+        // The header's length is only a guide: MP3 may run past it.
+        const int percent =
+            info.frames > 0
+                ? static_cast<int>(std::min<sf_count_t>(99, framesRead * 100 / info.frames))
+                : 0;
+        if (progress && !progress(percent)) {
+            return {nullptr,
+                    Refused(path, QStringLiteral("was not decoded: the decode was cancelled"))};
+        }
     }
     if (sf_error(file) != SF_ERR_NO_ERROR) {
         return {nullptr, Refused(path, QStringLiteral("cannot be decoded: ") +
@@ -134,7 +144,7 @@ void* SoundMemoryAllocator<float>::AllocateHuge(std::size_t bytes) {
     return memory;
 }
 
-LoadedSamples LoadSampleFile(const QString& path) {
+LoadedSamples LoadSampleFile(const QString& path, const DecodeProgress& progress) {
     if (path.isEmpty()) return {nullptr, QStringLiteral("no file name")};
     SF_INFO info{};
     std::unique_ptr<SNDFILE, SndFileCloser> file(
@@ -147,7 +157,7 @@ LoadedSamples LoadSampleFile(const QString& path) {
         return {nullptr, Refused(path, QStringLiteral("is not a sound file"))};
     }
     try {
-        return Decode(file.get(), info, path);
+        return Decode(file.get(), info, path, progress);
     } catch (const std::bad_alloc&) {
         return {nullptr, Refused(path, QStringLiteral("does not fit in the memory left"))};
     }

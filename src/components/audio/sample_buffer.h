@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <cstdlib>
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -60,7 +61,10 @@ struct LoadedSamples {
     QString error;  // why it could not be loaded, naming the file, when buffer is null
 };
 
+// Told how far a decode has come, 0..100, after every block; returning false abandons it.
+using DecodeProgress = std::function<bool(int percent)>;
+
 // Decodes WAV, AIFF, FLAC, Ogg and MP3 with libsndfile. Runs on the calling thread. A file
 // without a single frame, one longer than kMostSoundSamples and one that does not fit in the
 // memory left are refused.
-LoadedSamples LoadSampleFile(const QString& path);
+LoadedSamples LoadSampleFile(const QString& path, const DecodeProgress& progress = {});

@@ -1,23 +1,32 @@
 #include "components/audio/sample_cache.h"
 
-#include <QFileInfo>
-
 LoadedSamples SampleCache::load(const QString& path) {
     const QFileInfo info(path);
     if (!info.isFile()) {
-        entries_.remove(path);
+        forget(path);
         return {nullptr, QStringLiteral("the file does not exist")};
     }
-    const auto found = entries_.constFind(path);
-    if (found != entries_.cend() && found->size == info.size() &&
-        found->modified == info.lastModified()) {
-        if (auto buffer = found->buffer.lock()) return {std::move(buffer), QString()};
-    }
+    if (auto buffer = find(path, info)) return {std::move(buffer), QString()};
     LoadedSamples loaded = LoadSampleFile(path);
     if (loaded.buffer) {
-        entries_.insert(path, Entry{loaded.buffer, info.size(), info.lastModified()});
+        remember(path, loaded.buffer, StampOf(info));
     } else {
-        entries_.remove(path);
+        forget(path);
     }
     return loaded;
+}
+
+std::shared_ptr<const SampleBuffer> SampleCache::find(const QString& path,
+                                                      const QFileInfo& info) const {
+    const auto found = entries_.constFind(path);
+    if (found == entries_.cend() || found->stamp.size != info.size() ||
+        found->stamp.modified != info.lastModified()) {
+        return nullptr;
+    }
+    return found->buffer.lock();
+}
+
+void SampleCache::remember(const QString& path, std::shared_ptr<const SampleBuffer> buffer,
+                           Stamp stamp) {
+    entries_.insert(path, Entry{std::move(buffer), std::move(stamp)});
 }
