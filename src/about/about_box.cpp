@@ -2,6 +2,7 @@
 
 #include "about/program_icon.h"
 
+#include <QEventLoop>
 #include <QFrame>
 #include <QHBoxLayout>
 #include <QLabel>
@@ -9,9 +10,12 @@
 #include <QTimer>
 #include <QVBoxLayout>
 
+#include <algorithm>
+
 namespace {
 
-constexpr int kSplashMilliseconds = 3000;
+// A platform that never draws the splash must not hold start-up up for longer than this.
+constexpr int kLongestWaitForFirstPaint = 1000;
 
 const char* const kDescription[] = {
     "Virtual recording studio, sound mixer and simple editor.",
@@ -90,26 +94,56 @@ AboutBox::AboutBox(Mode mode, QWidget* parent) : QDialog(parent), mode_(mode) {
 
     timerAbout_ = new QTimer(this);
     timerAbout_->setObjectName(QStringLiteral("timerAbout"));
-    timerAbout_->setInterval(kSplashMilliseconds);
     timerAbout_->setSingleShot(true);
+    timerAbout_->setTimerType(Qt::PreciseTimer);  // a coarse one may add 5 % to the wait
     connect(timerAbout_, &QTimer::timeout, this, &QDialog::accept);
-    if (mode_ == Mode::Splash) timerAbout_->start();
 }
 
-void AboutBox::setSplashInterval(int milliseconds) {
-    timerAbout_->setInterval(milliseconds);
+void AboutBox::ShowSplash() {
+    show();
+    if (!painted_) {  // some platforms draw a window as it is shown
+        QEventLoop untilPainted;
+        connect(this, &AboutBox::painted, &untilPainted, &QEventLoop::quit);
+        connect(this, &QDialog::finished, &untilPainted, &QEventLoop::quit);
+        QTimer::singleShot(kLongestWaitForFirstPaint, &untilPainted, &QEventLoop::quit);
+        untilPainted.exec();
+    }
+    // Its time to be read counts from when it is seen, not from when it was built.
+    shownFor_.start();
 }
 
-int AboutBox::splashInterval() const {
-    return timerAbout_->interval();
+void AboutBox::CloseSplashWhenReady(int minimumMilliseconds) {
+    if (!isVisible()) return;  // a key or a click while it was being drawn
+    QEventLoop untilClosed;
+    connect(this, &QDialog::finished, &untilClosed, &QEventLoop::quit);
+    // Keys and clicks that came while the program was busy are handled in this loop first.
+    timerAbout_->start(
+        static_cast<int>(std::max<qint64>(0, minimumMilliseconds - shownFor_.elapsed())));
+    untilClosed.exec();
 }
 
 QIcon AboutBox::ProgramIcon() {
     return QIcon(new ProgramIconEngine);
 }
 
-void AboutBox::showEvent(QShowEvent* event) {
-    QDialog::showEvent(event);
-    // The splash counts its three seconds from when it is seen, not from when it was built.
-    if (mode_ == Mode::Splash) timerAbout_->start();
+void AboutBox::paintEvent(QPaintEvent* event) {
+    QDialog::paintEvent(event);
+    painted_ = true;
+    emit painted();
+}
+
+void AboutBox::keyPressEvent(QKeyEvent* event) {
+    if (mode_ == Mode::Splash) {
+        accept();
+        return;
+    }
+    QDialog::keyPressEvent(event);
+}
+
+void AboutBox::mousePressEvent(QMouseEvent* event) {
+    if (mode_ == Mode::Splash) {
+        accept();
+        return;
+    }
+    QDialog::mousePressEvent(event);
 }

@@ -24,36 +24,6 @@
 #include <QCursor>
 #include <QGuiApplication>
 #include <QScreen>
-#include <QTimer>
-
-namespace {
-
-// Runs `then` once the widget has painted for the first time, so it is already on screen.
-class AfterFirstPaint : public QObject {
-  public:
-    AfterFirstPaint(QWidget* widget, std::function<void()> then)
-        : QObject(widget), then_(std::move(then)) {
-        widget->installEventFilter(this);
-    }
-
-  protected:
-    bool eventFilter(QObject* watched, QEvent* event) override {
-        if (event->type() == QEvent::Paint && then_) {
-            watched->removeEventFilter(this);
-            QTimer::singleShot(0, this, std::exchange(then_, nullptr));
-        }
-        return false;
-    }
-
-  private:
-    std::function<void()> then_;
-};
-
-void RunAfterFirstPaint(QWidget* widget, std::function<void()> then) {
-    new AfterFirstPaint(widget, std::move(then));
-}
-
-}  // namespace
 
 Backends::Backends() = default;
 Backends::Backends(Backends&&) noexcept = default;
@@ -151,36 +121,32 @@ Application::~Application() {
     Shutdown();
 }
 
+std::unique_ptr<AboutBox> Application::ShowSplash() {
+    auto splash = std::make_unique<AboutBox>(AboutBox::Mode::Splash);
+    splash->ShowSplash();
+    StartupTrace::instance().mark("splash-shown");
+    return splash;
+}
+
 void Application::Start() {
-    // The splash first; start-up goes on when it has closed itself or OK was pressed. The sound
-    // device opens while the splash shows, so its fraction of a second is not waited for again.
-    bool audioStarted = false;
-    auto startAudio = [this, &audioStarted] {
-        if (audioStarted) return;
-        audioStarted = true;
-        StartAudio();
-    };
-    {
-        AboutBox splash(AboutBox::Mode::Splash);
-        splash.setSplashInterval(backends_.splashMilliseconds);
-        // Filters run newest first: the trace, installed last, notes the paint before the
-        // sound device is opened.
-        RunAfterFirstPaint(&splash, startAudio);
-        StartupTrace::instance().watchFirstPaint(&splash, "splash-shown");
-        splash.exec();
-        StartupTrace::instance().mark("splash-closed");
-    }
-    startAudio();
-    // Centred on the screen, at the size its layout asks for.
-    window_->resize(window_->sizeHint().expandedTo(QSize(1180, 720)));
-    if (const QScreen* screen = QGuiApplication::primaryScreen()) {
-        window_->move(screen->availableGeometry().center() - window_->rect().center());
-    }
+    Start(ShowSplash());
+}
+
+void Application::Start(std::unique_ptr<AboutBox> splash) {
+    // What shows nothing is done while the splash is up, so the player waits for the work or
+    // the splash, whichever is longer, not for the one after the other.
+    StartAudio();
     GetStartupDefaults(context_, *backends_.settings);
     window_->SetAudioVolumeRange();
     InitializeAllMidiNotes(context_, *names_, backends_.padChannels());
     context_.GlobalTranspose = 0;
     context_.CurrentFileName.clear();
+    PrepareWindowHidden();
+    splash->CloseSplashWhenReady(backends_.splashMilliseconds);
+    splash.reset();
+    StartupTrace::instance().mark("splash-closed");
+    StartupTrace::instance().watchPlayable(window_.get());
+
     RunStartupMidiCheck(*midiSetup_, context_, *backends_.settings, *backends_.prompts,
                         [this] { ShowMidiSetup(); });
     window_->AlignMidiInfoLabels();
@@ -188,6 +154,19 @@ void Application::Start() {
     StartupTrace::instance().watchFirstPaint(window_.get(), "window-shown");
     StartupTrace::instance().startStallWatch();
     window_->show();
+    // Where no window manager hands the focus over, the keys would otherwise go nowhere.
+    window_->activateWindow();
+}
+
+// Centred on the screen at the size its layout asks for, its native window made and everything
+// in it drawn once off screen, so that showing it costs little more than putting it up.
+void Application::PrepareWindowHidden() {
+    window_->resize(window_->sizeHint().expandedTo(QSize(1180, 720)));
+    if (const QScreen* screen = QGuiApplication::primaryScreen()) {
+        window_->move(screen->availableGeometry().center() - window_->rect().center());
+    }
+    window_->winId();
+    window_->grab();
 }
 
 // Sound before the table: the table reset releases the pads' channels.

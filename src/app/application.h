@@ -10,6 +10,7 @@
 
 #include <memory>
 
+class AboutBox;
 class AudioEngine;
 class ComputerKeyboard;
 class MidiSetupDialog;
@@ -34,8 +35,8 @@ struct Backends {
     std::unique_ptr<MidiOutputPort> midiOut;
     QString instrumentList;
     QString drumList;
-    // How long the start-up splash stays (tests shorten it).
-    int splashMilliseconds = 3000;
+    // How long the start-up splash stays at the least, so it can be read (tests shorten it).
+    int splashMilliseconds = 600;
 
     // The audio engine, RtMidi ports, the user's settings, Qt's message boxes and the installed
     // name lists.
@@ -57,9 +58,15 @@ class Application : public QObject {
     explicit Application(Backends backends, QObject* parent = nullptr);
     ~Application() override;
 
-    // In this order: the splash, the audio engine, the settings defaults, the volume range, the
-    // table reset, the MIDI device check and the pads' controls; then the window is shown.
+    // Shows the start-up splash and returns once it is on screen; main() does so before the
+    // program is built, so that the building, too, happens while it shows.
+    static std::unique_ptr<AboutBox> ShowSplash();
+    // In this order: the splash, and while it shows the audio engine, the settings defaults,
+    // the volume range, the table reset and the window made ready hidden; once it has closed,
+    // the MIDI device check and the pads' controls; then the window is shown.
     void Start();
+    // The same under a splash that is up already.
+    void Start(std::unique_ptr<AboutBox> splash);
     // Releases the pads' channels, stops the audio engine and closes both MIDI ports.
     void Shutdown();
 
@@ -88,6 +95,7 @@ class Application : public QObject {
     void WireFileMenu();
     void WireOtherMenus();
     void StartAudio();
+    void PrepareWindowHidden();
 
     Context context_;
     Backends backends_;

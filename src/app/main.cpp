@@ -13,7 +13,9 @@ int main(int argc, char** argv) {
     QApplication::setApplicationName(QStringLiteral("Orvelle Quindara"));
     QApplication::setWindowIcon(AboutBox::ProgramIcon());
     ApplyDarkTheme(app);
+    // The splash is up first; the program is built and made ready while it shows.
+    std::unique_ptr<AboutBox> splash = Application::ShowSplash();
     Application program(Backends::Real());
-    program.Start();
+    program.Start(std::move(splash));
     return QApplication::exec();
 }

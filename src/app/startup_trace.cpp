@@ -1,5 +1,7 @@
 #include "app/startup_trace.h"
 
+#include <QApplication>
+#include <QDialog>
 #include <QEvent>
 #include <QTimer>
 #include <QWidget>
@@ -32,18 +34,58 @@ void StartupTrace::mark(const char* name) {
 
 void StartupTrace::watchFirstPaint(QWidget* widget, const char* name) {
     if (!enabled_) return;
-    widget->setProperty("oqTraceName", QByteArray(name));
-    widget->installEventFilter(this);
+    firstPaints_.insert(widget, QByteArray(name));
+    qApp->installEventFilter(this);
+}
+
+void StartupTrace::watchPlayable(QWidget* window) {
+    if (!enabled_) return;
+    playable_ = window;
+    qApp->installEventFilter(this);
 }
 
 bool StartupTrace::eventFilter(QObject* watched, QEvent* event) {
-    if (event->type() == QEvent::Paint) {
-        const QByteArray name = watched->property("oqTraceName").toByteArray();
-        watched->removeEventFilter(this);
-        // After this paint returns the frame is on screen; a zero-time timer runs right after it.
-        QTimer::singleShot(0, this, [this, name] { mark(name.constData()); });
+    const auto* dialog = qobject_cast<QDialog*>(watched);
+    const bool prompt = playable_ && dialog && dialog->isWindow();
+    bool playableMayChange = false;
+    switch (event->type()) {
+        case QEvent::Paint:
+            // After this paint returns the frame is on screen; a zero-time timer runs right
+            // after it.
+            if (const QByteArray name = firstPaints_.take(watched); !name.isEmpty())
+                QTimer::singleShot(0, this, [this, name] { mark(name.constData()); });
+            if (watched == playable_) playableMayChange = playablePainted_ = true;
+            break;
+        case QEvent::WindowActivate:
+            playableMayChange = watched == playable_;
+            break;
+        case QEvent::Show:
+            if (prompt && !prompts_.contains(watched)) {
+                prompts_.insert(watched);
+                firstPaints_.insert(watched, "prompt-shown");
+            }
+            break;
+        case QEvent::Hide:
+            if (prompt && prompts_.remove(watched)) {
+                mark("prompt-closed");
+                playableMayChange = true;
+            }
+            break;
+        default:
+            break;
     }
+    if (playableMayChange) QTimer::singleShot(0, this, &StartupTrace::CheckPlayable);
     return QObject::eventFilter(watched, event);
+}
+
+void StartupTrace::CheckPlayable() {
+    if (!playable_ || !playablePainted_ || !playable_->isActiveWindow() ||
+        QApplication::activeModalWidget())
+        return;
+    mark("window-playable");
+    playable_ = nullptr;
+    // Nothing more to watch: every later event goes straight to its receiver again.
+    if (firstPaints_.isEmpty()) qApp->removeEventFilter(this);
 }
 
 void StartupTrace::startStallWatch() {

@@ -2,6 +2,7 @@
 // on-screen keyboard, MIDI from the keyboard and the F-keys.
 #include "program_fixture.h"
 
+#include "about/about_box.h"
 #include "app/pad_strip.h"
 #include "components/widgets/fader.h"
 #include "components/widgets/lever_switch.h"
@@ -11,6 +12,7 @@
 
 #include <QApplication>
 #include <QDialog>
+#include <QElapsedTimer>
 #include <QLabel>
 #include <QPushButton>
 #include <QStatusBar>
@@ -44,22 +46,49 @@ struct MainWindowTest : ProgramTest {
 
 using StartupOrder = ProgramTest;
 
-TEST_F(StartupOrder, TheSplashComesFirstAndTheTableIsResetAfterIt) {
+TEST_F(StartupOrder, TheSplashFirstTheTableResetUnderItTheMidiCheckAfterIt) {
+    StoreDevices(0, 0);
     Build();
     Application& program = *this->program;
-    bool splashSeen = false;
-    QString functionDuringSplash = "unset";
+    program.backends().splashMilliseconds = 300;
+    QString functionWhenShown = "unset", functionWhenClosed = "unset";
+    bool midiOpenWhenClosed = true;
+    QElapsedTimer shown;
+    qint64 shownFor = -1;
     QTimer::singleShot(0, [&] {
-        QWidget* splash = QApplication::activeModalWidget();
-        splashSeen = splash && splash->windowTitle() == "About Orvelle Quindara...";
-        functionDuringSplash = program.context().NoteSlots[60].NoteFunction;
+        auto* splash = qobject_cast<QDialog*>(QApplication::activeModalWidget());
+        ASSERT_TRUE(splash && splash->windowTitle() == "About Orvelle Quindara...");
+        shown.start();
+        functionWhenShown = program.context().NoteSlots[60].NoteFunction;
+        QObject::connect(splash, &QDialog::finished, [&] {
+            shownFor = shown.elapsed();
+            functionWhenClosed = program.context().NoteSlots[60].NoteFunction;
+            midiOpenWhenClosed = midiOut->isOpen();
+        });
     });
     program.Start();
-    EXPECT_TRUE(splashSeen);
-    EXPECT_EQ(functionDuringSplash, "") << "the table is reset only after the splash";
-    EXPECT_EQ(program.context().NoteSlots[60].NoteFunction, "0");
+    EXPECT_EQ(functionWhenShown, "") << "the splash is on screen before the table is reset";
+    EXPECT_EQ(functionWhenClosed, "0") << "the table is reset while it shows";
+    EXPECT_FALSE(midiOpenWhenClosed) << "the MIDI device check follows it";
+    EXPECT_TRUE(midiOut->isOpen());
+    EXPECT_GE(shownFor, 300) << "up long enough to be read";
+    EXPECT_LT(shownFor, 3000) << "and gone by itself once start-up is ready";
     EXPECT_TRUE(program.window().isVisible());
     EXPECT_EQ(program.window().pad(60)->sliderVolume->minimum(), -5000);
+
+    // A key or a click closes it at once, however long it would stay.
+    for (const bool click : {false, true}) {
+        AboutBox splash(AboutBox::Mode::Splash);
+        splash.ShowSplash();
+        QTimer::singleShot(0, &splash, [&] {
+            click ? QTest::mouseClick(&splash, Qt::LeftButton)
+                  : QTest::keyClick(&splash, Qt::Key_A);
+        });
+        QElapsedTimer waited;
+        waited.start();
+        splash.CloseSplashWhenReady(20000);
+        EXPECT_LT(waited.elapsed(), 10000) << (click ? "a click" : "a key");
+    }
 }
 
 TEST_F(MainWindowTest, ThePlayModeLeverWritesTheSlotTheChannelAndTheToolTip) {
