@@ -1,12 +1,12 @@
 // One note-on of a MIDI slot through the dispatcher into the loopback MIDI Out port: four
 // messages built from the slot's text on every call.
-#include "components/audio/recording_wave_channels.h"
+#include "components/audio/playback/recording_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
+#include "engine/gm_names.h"
 #include "engine/input_dispatcher.h"
 #include "engine/note_slots.h"
 #include "engine/wave_playback.h"
-#include "pickers/gm_names.h"
 
 #include <benchmark/benchmark.h>
 

@@ -1,8 +1,8 @@
 // The mixer at work: sixteen pads sounding ten-second files at different rates and pans,
 // against sox doing the same mix; and how soon a triggered pad is heard.
-#include "components/audio/engine_wave_channels.h"
-#include "components/audio/offline_audio_device.h"
-#include "components/audio/wave_mixer.h"
+#include "components/audio/devices/offline_audio_device.h"
+#include "components/audio/playback/engine_wave_channels.h"
+#include "components/audio/playback/wave_mixer.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "engine/input_dispatcher.h"

@@ -1,6 +1,6 @@
 // Saving and opening a setup file whose sixteen pads all play wave files.
-#include "components/audio/recording_wave_channels.h"
-#include "engine/text_values.h"
+#include "base/text_values.h"
+#include "components/audio/playback/recording_wave_channels.h"
 #include "setup_files/setup_file.h"
 
 #include <benchmark/benchmark.h>

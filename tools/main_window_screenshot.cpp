@@ -13,7 +13,7 @@
 #include "components/widgets/lever_switch.h"
 #include "components/widgets/rotary_knob.h"
 #include "engine/computer_keys.h"
-#include "pickers/gm_names.h"
+#include "engine/gm_names.h"
 
 #include <QApplication>
 #include <QScreen>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "components/audio/wave_channel.h"
+#include "components/audio/playback/wave_channel.h"
 #include "components/midi/midi_port.h"
 #include "components/prompts/prompts.h"
 #include "components/settings/settings_store.h"

@@ -1,7 +1,7 @@
 #include "app/key_release_filter.h"
 
+#include "app/qt_key_codes.h"
 #include "engine/computer_keys.h"
-#include "engine/qt_key_codes.h"
 
 #include <QGuiApplication>
 #include <QKeyEvent>

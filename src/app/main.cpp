@@ -1,6 +1,6 @@
 #include "about/about_box.h"
 #include "app/application.h"
-#include "components/audio/alsa_silence.h"
+#include "components/audio/devices/alsa_silence.h"
 #include "components/widgets/dark_theme.h"
 
 #include <QApplication>

@@ -2,7 +2,8 @@
 
 #include "app/key_release_filter.h"
 #include "app/pad_strip.h"
-#include "components/audio/wave_channel.h"
+#include "app/qt_key_codes.h"
+#include "components/audio/playback/wave_channel.h"
 #include "components/widgets/fader.h"
 #include "components/widgets/level_meter.h"
 #include "components/widgets/lever_switch.h"
@@ -10,10 +11,9 @@
 #include "components/widgets/rotary_knob.h"
 #include "engine/computer_keys.h"
 #include "engine/global_midi_commands.h"
+#include "engine/gm_names.h"
 #include "engine/note_slots.h"
 #include "engine/pad_controls.h"
-#include "engine/qt_key_codes.h"
-#include "pickers/gm_names.h"
 
 #include <QApplication>
 #include <QCloseEvent>

@@ -1,8 +1,8 @@
 #include "engine/global_midi_commands.h"
 
+#include "base/text_values.h"
+#include "engine/gm_names.h"
 #include "engine/note_slots.h"
-#include "engine/text_values.h"
-#include "pickers/gm_names.h"
 
 #include <algorithm>
 

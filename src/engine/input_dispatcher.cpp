@@ -1,8 +1,8 @@
 #include "engine/input_dispatcher.h"
 
+#include "base/text_values.h"
 #include "components/midi/midi_port.h"
 #include "engine/note_slots.h"
-#include "engine/text_values.h"
 #include "engine/wave_playback.h"
 
 #include <algorithm>

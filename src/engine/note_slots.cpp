@@ -1,9 +1,9 @@
 #include "engine/note_slots.h"
 
-#include "components/audio/wave_channel.h"
+#include "base/text_values.h"
+#include "components/audio/playback/wave_channel.h"
 #include "components/settings/settings_store.h"
-#include "engine/text_values.h"
-#include "pickers/gm_names.h"
+#include "engine/gm_names.h"
 
 namespace {
 

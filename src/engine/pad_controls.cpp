@@ -1,10 +1,10 @@
 #include "engine/pad_controls.h"
 
-#include "components/audio/wave_channel.h"
+#include "base/text_values.h"
+#include "components/audio/playback/wave_channel.h"
+#include "engine/gm_names.h"
 #include "engine/input_dispatcher.h"
 #include "engine/note_slots.h"
-#include "engine/text_values.h"
-#include "pickers/gm_names.h"
 
 #include <algorithm>
 

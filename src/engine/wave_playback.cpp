@@ -1,8 +1,8 @@
 #include "engine/wave_playback.h"
 
-#include "components/audio/wave_channel.h"
+#include "base/text_values.h"
+#include "components/audio/playback/wave_channel.h"
 #include "components/prompts/prompts.h"
-#include "engine/text_values.h"
 
 #include <utility>
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "components/midi/midi_input_gate.h"
 #include "midi/midi_setup.h"
 
 #include <QObject>
@@ -10,7 +11,7 @@ class MidiInputPort;
 // Drains the MIDI In queue whenever the port says messages are waiting: note and controller
 // messages about the pads go to the dispatcher, and plain note-ons and note-offs on the first
 // channel move the keys. It keeps draining while a message box is open, whoever opened it.
-class MidiInputPump : public QObject {
+class MidiInputPump : public QObject, public MidiInputGate {
     Q_OBJECT
   public:
     MidiInputPump(MidiInputPort& midiIn, InputDispatcher& dispatcher, KeyDisplayFunction showKey,
@@ -18,10 +19,8 @@ class MidiInputPump : public QObject {
 
     void Pump();
 
-    // While a file dialog is open, incoming messages are taken off the queue and dropped, as if
-    // the port were closed, but the port and every connection made to it stay. Nests.
-    void BeginDiscarding() { ++discarding_; }
-    void EndDiscarding();
+    void BeginDiscarding() override { ++discarding_; }
+    void EndDiscarding() override;
 
   private:
     void Handle(int status, int data1, int data2);

@@ -1,9 +1,9 @@
 #include "midi/midi_setup_session.h"
 
+#include "base/text_values.h"
 #include "components/midi/midi_port.h"
 #include "components/settings/settings_store.h"
 #include "engine/note_slots.h"
-#include "engine/text_values.h"
 #include "midi/midi_setup.h"
 
 namespace {

@@ -1,9 +1,9 @@
 #include "midi/startup_device_check.h"
 
+#include "base/text_values.h"
 #include "components/prompts/prompts.h"
 #include "components/settings/settings_store.h"
 #include "engine/note_slots.h"
-#include "engine/text_values.h"
 #include "midi/midi_setup.h"
 
 namespace {

@@ -1,9 +1,9 @@
 #include "setup_files/file_commands.h"
 
+#include "components/midi/midi_input_gate.h"
 #include "components/prompts/prompts.h"
 #include "components/settings/settings_store.h"
 #include "engine/note_slots.h"
-#include "midi/midi_input_pump.h"
 #include "setup_files/setup_file.h"
 
 #include <QDir>
@@ -23,13 +23,13 @@ const QString kSaveChanges = QStringLiteral("Save changes to your file??");
 // MIDI In plays again when the dialog closes, however it closes.
 class MidiInQuietMeanwhile {
   public:
-    explicit MidiInQuietMeanwhile(MidiInputPump& pump) : pump_(pump) { pump_.BeginDiscarding(); }
+    explicit MidiInQuietMeanwhile(MidiInputGate& pump) : pump_(pump) { pump_.BeginDiscarding(); }
     ~MidiInQuietMeanwhile() { pump_.EndDiscarding(); }
     MidiInQuietMeanwhile(const MidiInQuietMeanwhile&) = delete;
     MidiInQuietMeanwhile& operator=(const MidiInQuietMeanwhile&) = delete;
 
   private:
-    MidiInputPump& pump_;
+    MidiInputGate& pump_;
 };
 
 // File systems whose folders hold no music and may not even list (reading /proc/kcore hangs).
@@ -51,7 +51,7 @@ MessagePrompt Question(const QString& text, PromptButton defaultButton) {
 }  // namespace
 
 FileCommands::FileCommands(Context& context, WaveChannels& channels, const GmNames& names,
-                           MidiInputPump& midiIn, Prompts& prompts, SettingsStore& settings,
+                           MidiInputGate& midiIn, Prompts& prompts, SettingsStore& settings,
                            Window window)
     : context_(context),
       channels_(channels),

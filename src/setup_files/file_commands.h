@@ -7,7 +7,7 @@
 #include <functional>
 
 class GmNames;
-class MidiInputPump;
+class MidiInputGate;
 class SettingsStore;
 class WaveChannels;
 struct Context;
@@ -26,7 +26,7 @@ class FileCommands {
     };
 
     FileCommands(Context& context, WaveChannels& channels, const GmNames& names,
-                 MidiInputPump& midiIn, Prompts& prompts, SettingsStore& settings, Window window);
+                 MidiInputGate& midiIn, Prompts& prompts, SettingsStore& settings, Window window);
 
     static QString TitleFor(const QString& path);  // "" gives the untitled caption
 
@@ -61,7 +61,7 @@ class FileCommands {
     Context& context_;
     WaveChannels& channels_;
     const GmNames& names_;
-    MidiInputPump& midiIn_;
+    MidiInputGate& midiIn_;
     Prompts& prompts_;
     SettingsStore& settings_;
     Window window_;

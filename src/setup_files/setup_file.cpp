@@ -1,7 +1,7 @@
 #include "setup_files/setup_file.h"
 
-#include "components/audio/wave_channel.h"
-#include "engine/text_values.h"
+#include "base/text_values.h"
+#include "components/audio/playback/wave_channel.h"
 #include "setup_files/setup_file_format.h"
 
 #include <QFile>

@@ -1,6 +1,6 @@
 #include "setup_files/setup_file_format.h"
 
-#include "setup_files/ansi_text.h"
+#include "base/ansi_text.h"
 
 #include <QtEndian>
 

@@ -2,11 +2,11 @@
 // scripts and CI start them. A pad plays a 1 kHz sine at -6 dBFS through the engine; a second
 // stream records what came out and the level must arrive within 1 dB on each side. The pad is
 // panned so that a swap of the sides shows.
-#include "components/audio/audio_api.h"
 #include "components/audio/audio_engine.h"
-#include "components/audio/pulse_probe.h"
-#include "components/audio/rtaudio_input_device.h"
-#include "components/midi/jack_probe.h"
+#include "components/audio/devices/audio_api.h"
+#include "components/audio/devices/rtaudio_input_device.h"
+#include "components/servers/jack_probe.h"
+#include "components/servers/pulse_probe.h"
 #include "components/settings/memory_settings_store.h"
 #include "engine/note_slots.h"
 #include "support/sound_servers.h"

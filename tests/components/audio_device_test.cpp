@@ -1,6 +1,6 @@
-#include "components/audio/audio_api.h"
-#include "components/audio/audio_device_settings.h"
-#include "components/audio/null_audio_device.h"
+#include "components/audio/devices/audio_api.h"
+#include "components/audio/devices/audio_device_settings.h"
+#include "components/audio/devices/null_audio_device.h"
 #include "components/settings/memory_settings_store.h"
 
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 #include "components/audio/audio_engine.h"
-#include "components/audio/audio_api.h"
-#include "components/audio/offline_audio_device.h"
+#include "components/audio/devices/audio_api.h"
+#include "components/audio/devices/offline_audio_device.h"
 #include "components/settings/memory_settings_store.h"
 #include "support/wave_files.h"
 

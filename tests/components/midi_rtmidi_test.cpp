@@ -1,4 +1,4 @@
-#include "components/audio/alsa_silence.h"
+#include "components/audio/devices/alsa_silence.h"
 #include "components/midi/rtmidi_client.h"
 #include "components/midi/rtmidi_input_port.h"
 #include "components/midi/rtmidi_output_port.h"

@@ -1,7 +1,7 @@
 #include "engine/computer_keys.h"
 #include "app/key_release_filter.h"
+#include "app/qt_key_codes.h"
 #include "dispatch_fixture.h"
-#include "engine/qt_key_codes.h"
 
 #include <QKeyEvent>
 #include <QTest>

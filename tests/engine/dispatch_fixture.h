@@ -1,13 +1,13 @@
 #pragma once
 
-#include "components/audio/recording_wave_channels.h"
+#include "components/audio/playback/recording_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "components/settings/memory_settings_store.h"
+#include "engine/gm_names.h"
 #include "engine/input_dispatcher.h"
 #include "engine/note_slots.h"
 #include "engine/wave_playback.h"
-#include "pickers/gm_names.h"
 
 #include <gtest/gtest.h>
 

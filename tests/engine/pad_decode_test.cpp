@@ -1,7 +1,7 @@
 // Pads whose files decode on the worker: the event loop keeps running, and a press made meanwhile
 // sounds once the file is ready.
-#include "components/audio/engine_wave_channels.h"
-#include "components/audio/offline_audio_device.h"
+#include "components/audio/devices/offline_audio_device.h"
+#include "components/audio/playback/engine_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "engine/input_dispatcher.h"

@@ -1,14 +1,14 @@
 // Pads played end to end: the dispatcher and wave playback over the real mixer, rendered on the
 // offline device.
-#include "components/audio/engine_wave_channels.h"
-#include "components/audio/offline_audio_device.h"
+#include "components/audio/devices/offline_audio_device.h"
+#include "components/audio/playback/engine_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "components/settings/memory_settings_store.h"
+#include "engine/gm_names.h"
 #include "engine/input_dispatcher.h"
 #include "engine/note_slots.h"
 #include "engine/wave_playback.h"
-#include "pickers/gm_names.h"
 #include "support/wave_files.h"
 
 #include <QTemporaryDir>

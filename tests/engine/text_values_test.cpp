@@ -1,4 +1,4 @@
-#include "engine/text_values.h"
+#include "base/text_values.h"
 
 #include <QList>
 

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "components/midi/jack_probe.h"
 #include "components/midi/midi_port.h"
+#include "components/servers/jack_probe.h"
 #include "support/sound_servers.h"
 
 #include <QStringList>

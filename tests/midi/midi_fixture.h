@@ -1,6 +1,6 @@
 #pragma once
 
-#include "components/audio/recording_wave_channels.h"
+#include "components/audio/playback/recording_wave_channels.h"
 #include "components/midi/loopback_midi.h"
 #include "components/prompts/scripted_prompts.h"
 #include "engine/input_dispatcher.h"

@@ -80,10 +80,12 @@ TEST(ProgramEndToEnd, APlayersFirstMinutesThroughTheRealWindowAndJack) {
         }
     }
     QTemporaryDir home;
-    const QString display = QStringLiteral(":%1").arg(60 + QCoreApplication::applicationPid() % 19);
+    // Xvfb picks a free display and names it, so a server left over elsewhere is never shared.
     QProcess xvfb;
-    xvfb.start("Xvfb", {display, "-screen", "0", "1600x1000x24", "-nolisten", "tcp"});
+    xvfb.start("Xvfb", {"-displayfd", "1", "-screen", "0", "1600x1000x24", "-nolisten", "tcp"});
     ASSERT_TRUE(xvfb.waitForStarted());
+    ASSERT_TRUE(WaitFor([&] { return xvfb.canReadLine(); }));
+    const QString display = ':' + QString::fromLatin1(xvfb.readLine()).trimmed();
     auto stopXvfb = qScopeGuard([&] {
         xvfb.terminate();
         xvfb.waitForFinished(3000);

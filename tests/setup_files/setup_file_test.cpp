@@ -1,6 +1,6 @@
 #include "setup_files/setup_file.h"
 
-#include "components/audio/recording_wave_channels.h"
+#include "components/audio/playback/recording_wave_channels.h"
 #include "setup_file_builders.h"
 
 #include <gtest/gtest.h>

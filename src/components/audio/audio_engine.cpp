@@ -1,7 +1,7 @@
 #include "components/audio/audio_engine.h"
 
-#include "components/audio/audio_device_settings.h"
-#include "components/audio/null_audio_device.h"
+#include "components/audio/devices/audio_device_settings.h"
+#include "components/audio/devices/null_audio_device.h"
 
 AudioEngine::AudioEngine(const SettingsStore& settings, QObject* parent)
     : QObject(parent), settings_(&settings), channels_(mixer_) {}

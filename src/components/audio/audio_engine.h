@@ -1,8 +1,8 @@
 #pragma once
 
-#include "components/audio/audio_device.h"
-#include "components/audio/engine_wave_channels.h"
-#include "components/audio/wave_mixer.h"
+#include "components/audio/devices/audio_device.h"
+#include "components/audio/playback/engine_wave_channels.h"
+#include "components/audio/playback/wave_mixer.h"
 #include "components/settings/settings_store.h"
 
 #include <QObject>

@@ -1,6 +1,6 @@
 #include "components/midi/midi_system.h"
 
-#include "components/midi/jack_probe.h"
+#include "components/servers/jack_probe.h"
 
 #include <QFileInfo>
 

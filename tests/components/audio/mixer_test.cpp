@@ -1,6 +1,6 @@
-#include "components/audio/engine_wave_channels.h"
-#include "components/audio/offline_audio_device.h"
-#include "components/audio/wave_mixer.h"
+#include "components/audio/devices/offline_audio_device.h"
+#include "components/audio/playback/engine_wave_channels.h"
+#include "components/audio/playback/wave_mixer.h"
 #include "support/wave_files.h"
 
 #include <QTemporaryDir>

@@ -1,5 +1,5 @@
-#include "components/audio/path_and_time_text.h"
-#include "components/audio/precise_timer.h"
+#include "base/path_and_time_text.h"
+#include "components/timing/precise_timer.h"
 
 #include <QElapsedTimer>
 #include <QTest>

@@ -1,4 +1,4 @@
-#include "components/audio/sample_buffer.h"
+#include "components/audio/playback/sample_buffer.h"
 
 #include <QFile>
 #include <QTemporaryDir>

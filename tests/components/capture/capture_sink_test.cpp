@@ -1,7 +1,7 @@
 #include "components/audio/capture/capture_sink.h"
-#include "capture_signals.h"
 #include "components/audio/capture/capture_bands.h"
 #include "components/audio/capture/resampler.h"
+#include "support/capture_signals.h"
 
 #include <gtest/gtest.h>
 

@@ -1,5 +1,5 @@
 #include "components/audio/capture/wave_recorder.h"
-#include "capture_signals.h"
+#include "support/capture_signals.h"
 
 #include <gtest/gtest.h>
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "components/audio/audio_device.h"
 #include "components/audio/capture/resampler.h"
 #include "components/audio/capture/sample_ring.h"
 #include "components/audio/capture/scope_exchange.h"
+#include "components/audio/devices/audio_device.h"
 
 #include <atomic>
 #include <cstdint>

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "components/audio/audio_device.h"
 #include "components/audio/capture/capture_bands.h"
 #include "components/audio/capture/capture_sink.h"
 #include "components/audio/capture/wave_file_writer.h"
+#include "components/audio/devices/audio_device.h"
 
 #include <QObject>
 #include <QString>
