@@ -1,1 +1,0 @@
-#include "app/main_window.h"
