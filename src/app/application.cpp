@@ -108,6 +108,16 @@ void Application::WireFileMenu() {
 }
 
 void Application::WireOtherMenus() {
+    // Sounds that take longer than a moment to decode (a setup file just opened) say how far
+    // they are, and the notice goes once they are all ready.
+    connect(&backends_.padChannels(), &WaveChannels::loadProgress, window_.get(),
+            [this](int percent) {
+                if (percent < 100) {
+                    window_->ShowStatus(QStringLiteral("Loading sounds... %1%").arg(percent));
+                } else {
+                    window_->ShowStatus(QString());
+                }
+            });
     connect(window_.get(), &MainWindow::closed, this, &Application::Shutdown);
     connect(window_.get(), &MainWindow::allSoundsOffRequested, this, &Application::AllSoundsOff);
     connect(window_.get(), &MainWindow::aboutRequested, this, &Application::ShowAbout);
