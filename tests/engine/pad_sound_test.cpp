@@ -11,13 +11,28 @@
 #include "engine/wave_playback.h"
 #include "support/wave_files.h"
 
+#include <QCoreApplication>
+#include <QFile>
+#include <QKeyEvent>
+#include <QSignalSpy>
 #include <QTemporaryDir>
+#include <QTest>
 
 #include <gtest/gtest.h>
 
 #include <cmath>
 
 namespace {
+
+// Notes whether the pad's file was still decoding when a key event reached it.
+struct KeyCatcher : QObject {
+    MixerWaveChannel* channel = nullptr;
+    bool handledDuringDecode = false;
+    bool event(QEvent* event) override {
+        if (event->type() == QEvent::KeyPress) handledDuringDecode = channel->isDecoding();
+        return QObject::event(event);
+    }
+};
 
 struct PadSoundTest : ::testing::Test {
     QTemporaryDir dir;
@@ -31,6 +46,15 @@ struct PadSoundTest : ::testing::Test {
     WavePlayback waves{context, channels, prompts};
     InputDispatcher dispatcher{context, midiOut, waves};
     QString drum;
+    QSignalSpy loaded{&channels, &WaveChannels::loaded};
+
+    // A minute of stereo: long enough that its decode is still under way after a press.
+    QString LongSound(const char* name) {
+        const QString file = dir.filePath(QLatin1String(name));
+        EXPECT_TRUE(WriteTestWave(
+            file, 48000, 2, 60 * 48000, [](long, int) { return 0.25f; }, true));
+        return file;
+    }
 
     void SetUp() override {
         GetStartupDefaults(context, MemorySettingsStore());
@@ -117,4 +141,44 @@ TEST_F(PadSoundTest, AllFourPlayModesHeardEndToEnd) {
     for (int i = 0; i < 15; ++i)
         ASSERT_TRUE(Heard()) << "still sounding after the restart, period " << i;
     EXPECT_TRUE(prompts.shownMessages.isEmpty());
+}
+
+// Pads whose files decode on the worker: the event loop keeps running, and a press made meanwhile
+// sounds once the file is ready.
+TEST_F(PadSoundTest, TheEventLoopRunsWhileAFileDecodesAndAPressMadeMeanwhileSoundsAfter) {
+    const QString file = LongSound("60.wav");
+    MakePad(60, 0, file);
+    KeyCatcher catcher;
+    catcher.channel = &channels.channel(60);
+    ASSERT_TRUE(channels.channel(60).load(file));  // as opening a setup file does
+    QCoreApplication::postEvent(&catcher, new QKeyEvent(QEvent::KeyPress, Qt::Key_A, {}));
+    dispatcher.ProcessInputData(144, 60, 100);
+    EXPECT_FALSE(Heard());
+
+    ASSERT_TRUE(QTest::qWaitFor([&] { return loaded.size() == 1; }, 20000));
+    EXPECT_TRUE(catcher.handledDuringDecode) << "the key waited for the decode";
+    EXPECT_EQ(loaded[0], QVariantList({60, true, QString()}));
+    EXPECT_TRUE(Heard());
+    EXPECT_TRUE(prompts.shownMessages.isEmpty());
+}
+
+TEST_F(PadSoundTest, AHeldPadReleasedMeanwhileStaysSilentAndAFailedDecodeIsReported) {
+    MakePad(59, 2, LongSound("59.wav"));
+    const QString broken = dir.filePath("61.wav");
+    QFile bytes(broken);
+    ASSERT_TRUE(bytes.open(QIODevice::WriteOnly) && bytes.write(QByteArray(1 << 20, 'x')));
+    bytes.close();
+    MakePad(61, 1, broken);
+    dispatcher.ProcessInputData(144, 59, 100);  // decodes at the press: the file is large
+    dispatcher.ProcessInputData(128, 59, 0);
+    dispatcher.ProcessInputData(144, 61, 100);
+    EXPECT_TRUE(channels.channel(59).isDecoding() && channels.channel(61).isDecoding());
+
+    ASSERT_TRUE(QTest::qWaitFor([&] { return loaded.size() == 2; }, 20000));
+    EXPECT_FALSE(Heard() || Heard());
+    EXPECT_EQ(context.NoteSlots[61].WavePlaying, "False");
+    QCoreApplication::sendPostedEvents();
+    ASSERT_EQ(prompts.shownMessages.size(), 1);
+    EXPECT_TRUE(prompts.shownMessages[0].text.startsWith("Problem playing specified audio file"));
+    EXPECT_TRUE(prompts.shownMessages[0].text.contains(broken));
 }
